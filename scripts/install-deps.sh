@@ -1,0 +1,49 @@
+#!/usr/bin/env bash
+# Installs what building, testing or another task needs and the machine lacks, from Debian's packages. Prints nothing
+# when nothing is missing.
+#
+#   scripts/install-deps.sh [TASK...]    tasks: build (the default), test
+set -euo pipefail
+
+# Per task: packages that are programs or headers, and libraries, which 32-bit x86 needs in its own version, too.
+declare -A programs=(
+  [build]="g++ cmake ninja-build libcli11-dev"
+  [test]="binutils"
+)
+declare -A libraries=(
+  [build]="libjansson-dev android-liblog-dev"
+  [test]="libgtest-dev"
+)
+
+[ $# -gt 0 ] || set -- build
+host=$(dpkg --print-architecture)
+wanted=()
+for task in "$@"; do
+  read -ra more <<<"${programs[$task]}"
+  wanted+=("${more[@]}")
+  read -ra more <<<"${libraries[$task]}"
+  wanted+=("${more[@]/%/:$host}")
+  if [ "$host" = amd64 ]; then wanted+=(g++-multilib "${more[@]/%/:i386}"); fi
+done
+
+installed=$(dpkg-query --show --showformat '${Package} ${Status}\n${Package}:${Architecture} ${Status}\n' |
+  sed -n 's/ install ok installed$//p')
+missing=$(printf '%s\n' "${wanted[@]}" | sort -u | grep -vxF -f <(printf '%s\n' "$installed") || true)
+[ -n "$missing" ] || exit 0
+
+echo "Installing $(tr '\n' ' ' <<<"$missing")"
+if [ "$(id -u)" -ne 0 ]; then
+  echo "Installing packages takes root: run '$0 $*' as root once." >&2
+  exit 1
+fi
+export DEBIAN_FRONTEND=noninteractive
+log=$(mktemp)
+trap 'rm -f "$log"' EXIT
+if [ "$host" = amd64 ]; then dpkg --add-architecture i386; fi
+# An index that can not be fetched may well not be one that is needed: the installation decides.
+apt-get update >"$log" 2>&1 || true
+# shellcheck disable=SC2086 # one word a package
+if ! apt-get install -y --no-install-recommends $missing >>"$log" 2>&1; then
+  cat "$log" >&2
+  exit 1
+fi

@@ -1,0 +1,102 @@
+#include <android/log.h>
+#include <hardware/hardware.h>
+
+#include <cstdio>
+#include <cstring>
+
+#include "audio/aware_device.h"
+#include "senseloom.h"
+
+constinit aware_hw_device* device = nullptr;
+constinit bool gIsActivated = false;
+
+namespace {
+
+constexpr const char* kTag = "aware_audio";
+constexpr const char* kClass = "aware";
+constexpr const char* kInstance = "primary";
+constexpr const char* kInterface = "aware_hw_if";
+constexpr uint32_t kVersion = 0x200;  // device API version 2.0
+
+constexpr int32_t q15(double fraction) { return static_cast<int32_t>(fraction * 32768); }
+
+constexpr AwareParameters kParameters = {
+    .word0 = 128,
+    .half4 = 12,
+    .half6 = 20,
+    .half8 = 24,
+    .word12 = 76,
+    .word16 = -2,
+    .word20 = -1,
+    .word24 = 21,
+    .word28 = q15(0.475),
+    .word32 = q15(0.98),
+    .word36 = q15(0.2),
+    .word40 = q15(0.1),
+    .half44 = 64,
+    .half46 = 4,
+};
+
+// Opens the device if it is not open. A device of a wrong version stays open, and only the call that opened it fails, on
+// purpose: the next one finds it open and goes on with it.
+bool open() {
+  if (device != nullptr) {
+    __android_log_print(ANDROID_LOG_DEBUG, kTag, "It is already inited!");
+    return true;
+  }
+  const hw_module_t* module = nullptr;
+  int rc = hw_get_module_by_class(kClass, kInstance, &module);
+  // The first text names audio_hal_init() in all three functions, on purpose.
+  __android_log_print(ANDROID_LOG_DEBUG, kTag, "%s load audio hw module %s.%s (%s)", "bool audio_hal_init()", kClass,
+                      kInstance, std::strerror(-rc));
+  if (rc != 0) return false;
+  rc = module->methods->open(module, kInterface, reinterpret_cast<hw_device_t**>(&device));
+  __android_log_print(ANDROID_LOG_DEBUG, kTag, "device open result %d\n", rc);
+  if (rc != 0 || device == nullptr) return false;
+  __android_log_print(ANDROID_LOG_DEBUG, kTag, "device version %d\n", static_cast<int>(device->common.version));
+  return device->common.version == kVersion;
+}
+
+bool openOrLog() {
+  if (open()) return true;
+  __android_log_print(ANDROID_LOG_ERROR, kTag, "init audio hal failed");
+  return false;
+}
+
+}  // namespace
+
+bool audio_hal_init() noexcept { return open(); }
+
+bool audio_hal_activate() noexcept {
+  if (!openOrLog()) return false;
+  if (gIsActivated) {
+    __android_log_print(ANDROID_LOG_DEBUG, kTag, "already activated, return");
+    return true;
+  }
+  __android_log_print(ANDROID_LOG_DEBUG, kTag, "activating aware... %p\n", static_cast<void*>(device));
+  if (device->activate(device, &kParameters) != 0) {
+    __android_log_print(ANDROID_LOG_ERROR, kTag, "activated aware failed\n");
+    return false;
+  }
+  __android_log_print(ANDROID_LOG_DEBUG, kTag, "activated aware successful...\n");
+  gIsActivated = true;
+  return true;
+}
+
+bool audio_hal_deactivate() noexcept {
+  if (!openOrLog()) return false;
+  if (!gIsActivated) {
+    __android_log_print(ANDROID_LOG_DEBUG, kTag, "already deactivated, return");
+    return true;
+  }
+  std::puts("deactivating aware session...");  // this one goes to standard output instead of the log, on purpose
+  if (device->deactivate(device) != 0) {
+    __android_log_print(ANDROID_LOG_ERROR, kTag, "deactivated aware session failed \n");
+    return false;
+  }
+  __android_log_print(ANDROID_LOG_DEBUG, kTag, "deactivated aware session successful... \n");
+  gIsActivated = false;
+  device->common.close(&device->common);
+  device = nullptr;
+  return true;
+}

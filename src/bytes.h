@@ -1,0 +1,38 @@
+#pragma once
+
+#include <cassert>
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+#include <span>
+
+// Integers in the bytes of data records. A record's address has no guaranteed alignment, so every access is a copy.
+namespace senseloom {
+
+template <class Integer>
+Integer load(std::span<const uint8_t> bytes, size_t offset) {
+  assert(offset + sizeof(Integer) <= bytes.size());
+  Integer value;
+  std::memcpy(&value, bytes.data() + offset, sizeof value);
+  return value;
+}
+
+template <class Integer>
+void store(std::span<uint8_t> bytes, size_t offset, Integer value) {
+  assert(offset + sizeof(Integer) <= bytes.size());
+  std::memcpy(bytes.data() + offset, &value, sizeof value);
+}
+
+inline int16_t loadI16(std::span<const uint8_t> bytes, size_t offset) { return load<int16_t>(bytes, offset); }
+inline uint16_t loadU16(std::span<const uint8_t> bytes, size_t offset) { return load<uint16_t>(bytes, offset); }
+inline int32_t loadI32(std::span<const uint8_t> bytes, size_t offset) { return load<int32_t>(bytes, offset); }
+inline uint64_t loadU64(std::span<const uint8_t> bytes, size_t offset) { return load<uint64_t>(bytes, offset); }
+inline void storeU16(std::span<uint8_t> bytes, size_t offset, uint16_t value) { store(bytes, offset, value); }
+inline void storeI32(std::span<uint8_t> bytes, size_t offset, int32_t value) { store(bytes, offset, value); }
+
+// The bit of `mask` at `position`, taken modulo 32.
+inline bool bitAt(int32_t mask, int32_t position) {
+  return (static_cast<uint32_t>(mask) >> (static_cast<uint32_t>(position) & 31U) & 1U) != 0;
+}
+
+}  // namespace senseloom

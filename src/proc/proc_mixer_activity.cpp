@@ -1,0 +1,40 @@
+#include "proc/proc_mixer_activity.h"
+
+#include <array>
+
+#include "proc/activity_record.h"
+
+namespace senseloom {
+namespace {
+
+constexpr uint32_t kFirstWeight = 1024;
+constexpr size_t kClassIds = 16;
+constexpr size_t kVotedClasses = 8;
+constexpr uint16_t kNoMajority = 6;  // the class that stands for "no class has the majority", fixed on purpose
+
+}  // namespace
+
+void ProcMixerActivity::mix() {
+  const uint8_t* batch = prev->buffer();
+  const int count = prev->bufferLength();
+
+  // Weights and sums wrap around in 32 bits: with weightVar 0 the weight of the 22nd record already does.
+  std::array<uint32_t, kClassIds> scores{};
+  uint32_t total = 0;
+  uint32_t weight = kFirstWeight;
+  for (int i = 0; i < count; ++i) {
+    scores[ActivityRecord::at(batch + i * elemSize).classId()] += weight;
+    total += weight;
+    weight += static_cast<uint32_t>(static_cast<int32_t>(weight) >> weightShift);
+  }
+  for (size_t id = kVotedClasses; id < kClassIds; ++id) scores[0] += scores[id];  // unknown classes count as class 0
+
+  uint16_t winner = 0;  // of several with the same score, the lowest id
+  for (uint16_t id = 1; id < kVotedClasses; ++id) {
+    if (static_cast<int32_t>(scores[id]) > static_cast<int32_t>(scores[winner])) winner = id;
+  }
+  const bool majority = static_cast<int32_t>(scores[winner]) > static_cast<int32_t>(total) >> 1;
+  ActivityRecord::at(batch).withClass(majority ? winner : kNoMajority).storeAt(result.get());
+}
+
+}  // namespace senseloom

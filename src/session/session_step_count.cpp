@@ -1,0 +1,22 @@
+#include "session/session_step_count.h"
+
+#include "session/record.h"
+
+namespace senseloom {
+
+int SessionStepCount::parseOption(const char* text) {
+  option->parse(text);
+  return 0;
+}
+
+int SessionStepCount::postProcess(void* data, int len, void** out, int* outLen) {
+  const auto& wanted = static_cast<const OptionStepCount&>(*option);
+  if (wanted.mode() == 1) return passThrough(data, len, out, outLen);
+
+  const auto record = recordBytes(data, len);
+  if (record.size() < kValueOffset + sizeof(int32_t)) return 0;
+  const int32_t steps = loadI32(record, kValueOffset);
+  return steps % (wanted.logN() * 100) == 0 ? passThrough(data, len, out, outLen) : 0;
+}
+
+}  // namespace senseloom
