@@ -1,8 +1,9 @@
 # The product's word size on a Linux host of either word size: 32-bit x86.
 set(CMAKE_SYSTEM_NAME Linux)
 set(CMAKE_SYSTEM_PROCESSOR i686)
-set(CMAKE_C_FLAGS_INIT -m32)
-set(CMAKE_CXX_FLAGS_INIT -m32)
+# The last two: what every 32-bit x86 processor of Android has, and its compilers take for granted.
+set(CMAKE_C_FLAGS_INIT "-m32 -mssse3 -mfpmath=sse")
+set(CMAKE_CXX_FLAGS_INIT "-m32 -mssse3 -mfpmath=sse")
 set(CMAKE_LIBRARY_ARCHITECTURE i386-linux-gnu)
 set(CMAKE_CROSSCOMPILING_EMULATOR "")
 # Packages of the host's own word size stand in the same tree.

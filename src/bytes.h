@@ -23,12 +23,24 @@ void store(std::span<uint8_t> bytes, size_t offset, Integer value) {
   std::memcpy(bytes.data() + offset, &value, sizeof value);
 }
 
-inline int16_t loadI16(std::span<const uint8_t> bytes, size_t offset) { return load<int16_t>(bytes, offset); }
-inline uint16_t loadU16(std::span<const uint8_t> bytes, size_t offset) { return load<uint16_t>(bytes, offset); }
-inline int32_t loadI32(std::span<const uint8_t> bytes, size_t offset) { return load<int32_t>(bytes, offset); }
-inline uint64_t loadU64(std::span<const uint8_t> bytes, size_t offset) { return load<uint64_t>(bytes, offset); }
-inline void storeU16(std::span<uint8_t> bytes, size_t offset, uint16_t value) { store(bytes, offset, value); }
-inline void storeI32(std::span<uint8_t> bytes, size_t offset, int32_t value) { store(bytes, offset, value); }
+inline int16_t loadI16(std::span<const uint8_t> bytes, size_t offset) {
+  return load<int16_t>(bytes, offset);
+}
+inline uint16_t loadU16(std::span<const uint8_t> bytes, size_t offset) {
+  return load<uint16_t>(bytes, offset);
+}
+inline int32_t loadI32(std::span<const uint8_t> bytes, size_t offset) {
+  return load<int32_t>(bytes, offset);
+}
+inline uint64_t loadU64(std::span<const uint8_t> bytes, size_t offset) {
+  return load<uint64_t>(bytes, offset);
+}
+inline void storeU16(std::span<uint8_t> bytes, size_t offset, uint16_t value) {
+  store(bytes, offset, value);
+}
+inline void storeI32(std::span<uint8_t> bytes, size_t offset, int32_t value) {
+  store(bytes, offset, value);
+}
 
 // The bit of `mask` at `position`, taken modulo 32.
 inline bool bitAt(int32_t mask, int32_t position) {

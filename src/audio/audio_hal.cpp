@@ -18,7 +18,9 @@ constexpr const char* kInstance = "primary";
 constexpr const char* kInterface = "aware_hw_if";
 constexpr uint32_t kVersion = 0x200;  // device API version 2.0
 
-constexpr int32_t q15(double fraction) { return static_cast<int32_t>(fraction * 32768); }
+constexpr int32_t q15(double fraction) {
+  return static_cast<int32_t>(fraction * 32768);
+}
 
 constexpr AwareParameters kParameters = {
     .word0 = 128,
@@ -37,8 +39,8 @@ constexpr AwareParameters kParameters = {
     .half46 = 4,
 };
 
-// Opens the device if it is not open. A device of a wrong version stays open, and only the call that opened it fails, on
-// purpose: the next one finds it open and goes on with it.
+// Opens the device if it is not open. A device of a wrong version stays open, and only the call that opened it fails,
+// on purpose: the next one finds it open and goes on with it.
 bool open() {
   if (device != nullptr) {
     __android_log_print(ANDROID_LOG_DEBUG, kTag, "It is already inited!");
@@ -65,7 +67,9 @@ bool openOrLog() {
 
 }  // namespace
 
-bool audio_hal_init() noexcept { return open(); }
+bool audio_hal_init() noexcept {
+  return open();
+}
 
 bool audio_hal_activate() noexcept {
   if (!openOrLog()) return false;

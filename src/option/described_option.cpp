@@ -22,26 +22,6 @@ int32_t accept(const OptionKey& key, const char* tag, int32_t value) {
   return key.fallback;
 }
 
-int32_t merged(Merge rule, int32_t mine, int32_t other) {
-  switch (rule) {
-    case Merge::bitOr:
-      return mine | other;
-    case Merge::minimum:
-      return std::min(mine, other);
-    case Merge::maximum:
-      return std::max(mine, other);
-    case Merge::allOne:
-      return mine == 1 && other == 1 ? 1 : 0;
-    case Merge::anySet:
-      return mine != 0 || other != 0 ? 1 : 0;
-    case Merge::takeLast:
-      return other;
-    case Merge::keepFirst:
-      break;
-  }
-  return mine;
-}
-
 }  // namespace
 
 int32_t readInteger(const json_t* root, const char* key, int32_t fallback) {
@@ -77,13 +57,6 @@ int DescribedOption::parse(const char* text) {
   mirrors = {};
   adjust(read);
   return 0;
-}
-
-void DescribedOption::merge(const Option& other) {
-  const auto& that = static_cast<const DescribedOption&>(other);
-  for (size_t i = 0; i < described.keys.size(); ++i) {
-    settings[i] = merged(described.keys[i].merge, settings[i], that.settings[i]);
-  }
 }
 
 void DescribedOption::setProperty(ctx_option_t** out) {

@@ -23,7 +23,6 @@ int32_t readInteger(const json_t* root, const char* key, int32_t fallback);
 class DescribedOption : public Option {
  public:
   int parse(const char* text) final;
-  void merge(const Option& other) override;
   void setProperty(ctx_option_t** out) final;
 
   const OptionDescription& description() const { return described; }
@@ -58,6 +57,14 @@ class OptionKind : public DescribedOption {
 
   OptionKind() : DescribedOption(kDescription) {}
   std::unique_ptr<Option> clone() const override { return std::make_unique<Kind>(static_cast<const Kind&>(*this)); }
+
+  // The rules are known to the compiler here: a negotiation merges once for each session of the sensor.
+  void merge(const Option& other) override {
+    const auto& that = static_cast<const OptionKind&>(other);
+    for (size_t i = 0; i < kDescription.keys.size(); ++i) {
+      settings[i] = merged(kDescription.keys[i].merge, settings[i], that.settings[i]);
+    }
+  }
 };
 
 }  // namespace senseloom

@@ -6,7 +6,9 @@ namespace senseloom {
 namespace {
 
 // Shift counts use their low 5 bits, and what leaves the 32 bits is lost: "logN" as given can be any number.
-uint32_t shiftLeft(uint32_t value, int32_t count) { return value << (static_cast<uint32_t>(count) & 31U); }
+uint32_t shiftLeft(uint32_t value, int32_t count) {
+  return value << (static_cast<uint32_t>(count) & 31U);
+}
 
 }  // namespace
 
@@ -21,7 +23,7 @@ void OptionActivity::merge(const Option& other) {
   // The other's clamped logN and not its maxLogN, on purpose: only the option that the merge starts from brings in a
   // value as it was given.
   largestLogN = std::max(largestLogN, that.logN());
-  DescribedOption::merge(other);
+  OptionKind::merge(other);
   if (!sameSpan) settings[0] = 0;  // sessions with different spans can not share one report on change
 }
 

@@ -11,10 +11,7 @@ inline constexpr OptionKey kGestureFlickKeys[] = {
      .range = {1, 63},
      .message = "gestureflick: invalid clsmask value %d",
      .merge = Merge::bitOr},
-    {.name = "level",
-     .range = {-5, 5},
-     .message = "gestureflick: invalid level value %d",
-     .merge = Merge::minimum},
+    {.name = "level", .range = {-5, 5}, .message = "gestureflick: invalid level value %d", .merge = Merge::minimum},
 };
 inline constexpr OptionProperty kGestureFlickProperties[] = {{61, "classMask", 0}, {62, "level", 1}};
 inline constexpr OptionDescription kGestureFlick{

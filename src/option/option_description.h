@@ -1,5 +1,6 @@
 #pragma once
 
+#include <algorithm>
 #include <cstdint>
 #include <limits>
 #include <span>
@@ -37,6 +38,25 @@ enum class Merge {
   keepFirst,  // the option that the merge starts from decides
   takeLast,   // the session that was opened last decides
 };
+constexpr int32_t merged(Merge rule, int32_t mine, int32_t other) {
+  switch (rule) {
+    case Merge::bitOr:
+      return mine | other;
+    case Merge::minimum:
+      return std::min(mine, other);
+    case Merge::maximum:
+      return std::max(mine, other);
+    case Merge::allOne:
+      return mine == 1 && other == 1 ? 1 : 0;
+    case Merge::anySet:
+      return mine != 0 || other != 0 ? 1 : 0;
+    case Merge::takeLast:
+      return other;
+    case Merge::keepFirst:
+      break;
+  }
+  return mine;
+}
 
 // One integer key of an option string.
 struct OptionKey {

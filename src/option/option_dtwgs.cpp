@@ -19,7 +19,9 @@ const OptionKey& kIndexKey = kDTWGSKeys[3];
 
 // Only 0-9 and a-f give their value; anything else, uppercase included, gives a wrong one. Templates are written by the
 // enrolling side, which uses lowercase.
-int hexDigit(char c) { return c >= 'a' && c <= 'z' ? c - 'a' + 10 : c - '0'; }
+int hexDigit(char c) {
+  return c >= 'a' && c <= 'z' ? c - 'a' + 10 : c - '0';
+}
 
 int hexNumber(const char* digits, size_t count) {
   int number = 0;

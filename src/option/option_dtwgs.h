@@ -43,8 +43,9 @@ inline constexpr OptionDescription kDTWGS{
     .stringKeys = kDTWGSStringKeys,
     .properties = kDTWGSProperties,
     .logTag = kLogTag,
-    .note = "a value out of range refuses the whole string; no properties while enrolling; 122 and 123 once a stored "
-            "template; one session can enroll, and none can match meanwhile",
+    .note =
+        "a value out of range refuses the whole string; no properties while enrolling; 122 and 123 once a stored "
+        "template; one session can enroll, and none can match meanwhile",
 };
 
 // Enrolls a gesture, or matches movements against up to two templates. Unlike the other kinds it refuses a whole string

@@ -5,8 +5,8 @@
 
 namespace senseloom {
 
-// One activity class decision as it stands in records and batches: a class id in the low 4 bits of 16, a sequence number
-// in the upper 12.
+// One activity class decision as it stands in records and batches: a class id in the low 4 bits of 16, a sequence
+// number in the upper 12.
 class ActivityRecord {
  public:
   static constexpr int kSize = sizeof(uint16_t);

@@ -2,10 +2,9 @@
 
 namespace senseloom {
 
-bool ProcMask::accept(const void* data, int count) {
-  if (count < 0 || data == nullptr || !prev->accept(data, count)) return false;
-  uint8_t* element = prev->buffer();
-  for (int left = prev->length(); left > 0; --left, element += elemSize) maskFunc(element, maskArg);
+bool ProcMask::process() {
+  uint8_t* element = buffer();
+  for (int left = bufferLength(); left > 0; --left, element += elemSize) maskFunc(element, maskArg);
   return true;
 }
 

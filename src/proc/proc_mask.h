@@ -12,9 +12,9 @@ class ProcMask final : public ProcOnTop {
   ProcMask(std::unique_ptr<Proc> previous, MaskFunc mask, int arg)
       : ProcOnTop(std::move(previous)), maskFunc(mask), maskArg(arg) {}
 
-  bool accept(const void* data, int count) override;
-
  private:
+  bool process() override;
+
   const MaskFunc maskFunc;
   const int maskArg;
 };

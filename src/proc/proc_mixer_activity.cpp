@@ -17,15 +17,26 @@ constexpr uint16_t kNoMajority = 6;  // the class that stands for "no class has 
 void ProcMixerActivity::mix() {
   const uint8_t* batch = prev->buffer();
   const int count = prev->bufferLength();
+  if (count == 1) {  // what clients get who ask for nothing else: no vote to take, it has the majority
+    const auto only = ActivityRecord::at(batch);
+    only.withClass(only.classId() < kVotedClasses ? only.classId() : 0).storeAt(buffer());
+    return;
+  }
 
   // Weights and sums wrap around in 32 bits: with weightVar 0 the weight of the 22nd record already does.
   std::array<uint32_t, kClassIds> scores{};
   uint32_t total = 0;
   uint32_t weight = kFirstWeight;
-  for (int i = 0; i < count; ++i) {
-    scores[ActivityRecord::at(batch + i * elemSize).classId()] += weight;
-    total += weight;
-    weight += static_cast<uint32_t>(static_cast<int32_t>(weight) >> weightShift);
+  if (weight >> weightShift == 0) {  // all weigh the same
+#pragma GCC unroll 4
+    for (int i = 0; i < count; ++i) scores[ActivityRecord::at(batch + i * ActivityRecord::kSize).classId()] += weight;
+    total = static_cast<uint32_t>(count) * weight;
+  } else {
+    for (int i = 0; i < count; ++i) {
+      scores[ActivityRecord::at(batch + i * ActivityRecord::kSize).classId()] += weight;
+      total += weight;
+      weight += static_cast<uint32_t>(static_cast<int32_t>(weight) >> weightShift);
+    }
   }
   for (size_t id = kVotedClasses; id < kClassIds; ++id) scores[0] += scores[id];  // unknown classes count as class 0
 
@@ -34,7 +45,7 @@ void ProcMixerActivity::mix() {
     if (static_cast<int32_t>(scores[id]) > static_cast<int32_t>(scores[winner])) winner = id;
   }
   const bool majority = static_cast<int32_t>(scores[winner]) > static_cast<int32_t>(total) >> 1;
-  ActivityRecord::at(batch).withClass(majority ? winner : kNoMajority).storeAt(result.get());
+  ActivityRecord::at(batch).withClass(majority ? winner : kNoMajority).storeAt(buffer());
 }
 
 }  // namespace senseloom

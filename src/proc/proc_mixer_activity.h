@@ -4,8 +4,8 @@
 
 namespace senseloom {
 
-// Votes a batch of activity class records down to one class by weighted majority. The first record weighs 1024, and each
-// further one more than the one before it by its (1 / 2^weightVar)th part, so that recent records count more; with
+// Votes a batch of activity class records down to one class by weighted majority. The first record weighs 1024, and
+// each further one more than the one before it by its (1 / 2^weightVar)th part, so that recent records count more; with
 // weightVar -1, as from 11 on, all weigh the same.
 class ProcMixerActivity final : public ProcMixer {
  public:

@@ -5,7 +5,7 @@
 namespace senseloom {
 
 void ProcMixerPedo::mix() {
-  std::memcpy(result.get(), prev->buffer() + (prev->length() - 1) * elemSize, static_cast<size_t>(elemSize));
+  std::memcpy(buffer(), prev->buffer() + (prev->length() - 1) * elemSize, static_cast<size_t>(elemSize));
 }
 
 }  // namespace senseloom

@@ -6,8 +6,8 @@
 
 namespace senseloom {
 
-// The first stage of a chain: gathers batches of a fixed number of elements, in the order in which they arrive.
-class ProcNM final : public Proc {
+// Gathers batches of a fixed number of elements, in the order in which they arrive.
+class ProcNM final : public ProcFirst {
  public:
   using CheckSeqFunc = int (*)(const void*);
 
@@ -16,21 +16,23 @@ class ProcNM final : public Proc {
   ProcNM(int elementSize, EqualFunc equal, CheckSeqFunc checkSeq, int bufferLength);
   ProcNM(int elementSize, EqualFunc equal, int bufferLength) : ProcNM(elementSize, equal, nullptr, bufferLength) {}
 
-  // Elements beyond the room of the batch are dropped and not kept for the next batch, on purpose.
-  bool accept(const void* data, int count) override;
-  uint8_t* buffer() override { return batch.get(); }
   int length() const override { return filled; }
-  int bufferLength() const override { return capacity; }
-  void reset() override { filled = 0; }
 
   // Carried for the owner of the chain. Gathering never calls it: gaps and repeats in the sequence are taken as they
   // come.
   const CheckSeqFunc checkSeqFunc;
 
  private:
+  using Batch = std::unique_ptr<uint8_t[]>;
+  ProcNM(int elementSize, EqualFunc equal, CheckSeqFunc checkSeq, int bufferLength, Batch memory)
+      : ProcFirst(elementSize, equal, memory.get(), bufferLength), checkSeqFunc(checkSeq), batch(std::move(memory)) {}
+
+  // Elements beyond the room of the batch are dropped and not kept for the next batch, on purpose.
+  bool gather(const void* data, int count) override;
+  void drop() override { filled = 0; }
+
   int filled = 0;
-  const int capacity;
-  const std::unique_ptr<uint8_t[]> batch;
+  const Batch batch;
 };
 
 }  // namespace senseloom

@@ -11,9 +11,13 @@ constexpr int32_t kFirstCapacity = 16;
 constexpr int32_t kMostCapacity = 1 << 30;
 
 // Bytes of `slots` elements; the product can leave 32 bits, which calloc() and memcpy() then see as a size too large.
-size_t bytes(const varray_t* va, int32_t slots) { return static_cast<size_t>(slots) * static_cast<size_t>(va->elemSize); }
+size_t bytes(const varray_t* va, int32_t slots) {
+  return static_cast<size_t>(slots) * static_cast<size_t>(va->elemSize);
+}
 
-uint8_t* slotAt(const varray_t* va, int32_t index) { return static_cast<uint8_t*>(va->data) + bytes(va, index); }
+uint8_t* slotAt(const varray_t* va, int32_t index) {
+  return static_cast<uint8_t*>(va->data) + bytes(va, index);
+}
 
 bool grow(varray_t* va) {
   if (va->capacity >= kMostCapacity) return false;

@@ -28,18 +28,17 @@ constexpr size_t kSensors = std::size(kSensorKinds);
 // The sensors, in the order of their kinds: null before the first initialisation, and plain pointers, because those of
 // deleted sensors stay until the next one overwrites them.
 constinit std::array<ContextSensor*, kSensors> gSensors{};
-constinit bool gInited = false;
 
 }  // namespace
 
-constinit SessionSet gSessions;
-
-void _init_senseloom() {
-  if (gInited) return;
+bool _init_senseloom() noexcept try {
   std::array<std::unique_ptr<ContextSensor>, kSensors> sensors;
   for (size_t i = 0; i < kSensors; ++i) sensors[i] = kSensorKinds[i].makeSensor();
   for (size_t i = 0; i < kSensors; ++i) gSensors[i] = sensors[i].release();
   gInited = true;
+  return true;
+} catch (const std::bad_alloc&) {
+  return false;
 }
 
 }  // namespace senseloom
@@ -55,7 +54,8 @@ void* getSensor(const char* name) noexcept {
   using namespace senseloom;
   if (name == nullptr) return nullptr;
   for (size_t i = 0; i < kSensors; ++i) {
-    if (std::strcmp(name, kSensorKinds[i].name) == 0) return gSensors[i];
+    const char* kind = kSensorKinds[i].name;
+    if (name == kind || std::strcmp(name, kind) == 0) return gSensors[i];  // a session's name is the very same string
   }
   return nullptr;
 }

@@ -11,8 +11,7 @@
 using namespace senseloom;
 
 void* ctx_open_session(const char* sensorName) noexcept try {
-  _init_senseloom();
-  if (sensorName == nullptr) return nullptr;
+  if (!ensureSensors() || sensorName == nullptr) return nullptr;
   // Only the first 9 characters take part in the look-up.
   char name[10] = {};
   std::strncpy(name, sensorName, sizeof name - 1);
@@ -35,7 +34,7 @@ void* ctx_open_session(const char* sensorName) noexcept try {
 int ctx_set_option(void* handle, int32_t /*reserved*/, const char* option, ctx_option_t** out) noexcept try {
   if (option == nullptr || handle == nullptr || out == nullptr) return -1;
   *out = nullptr;
-  _init_senseloom();
+  if (!ensureSensors()) return -1;
   Session* session = gSessions.find(handle);
   if (session == nullptr) return -1;
   ContextSensor* sensor = findSensor(session->name);
@@ -49,19 +48,22 @@ int ctx_set_option(void* handle, int32_t /*reserved*/, const char* option, ctx_o
   return -1;
 }
 
-int ctx_dispatch_data(void* handle, void* data, int len, void** out, int* outlen) noexcept try {
+// Apart from the function below, so that what it has to keep over the call is not kept for every record.
+[[gnu::noinline, gnu::cold]] static int dispatchFirst(void* handle, void* data, int len, void** out, int* outlen) {
+  return _init_senseloom() ? ctx_dispatch_data(handle, data, len, out, outlen) : -1;
+}
+
+int ctx_dispatch_data(void* handle, void* data, int len, void** out, int* outlen) noexcept {
   if (data == nullptr || handle == nullptr || len < 0 || outlen == nullptr || out == nullptr) return -1;
-  _init_senseloom();
+  if (!gInited) return dispatchFirst(handle, data, len, out, outlen);
   Session* session = gSessions.find(handle);
   return session != nullptr ? session->postProcess(data, len, out, outlen) : -1;
-} catch (...) {
-  return -1;
 }
 
 int ctx_close_session(void* handle, ctx_option_t** option) noexcept try {
   if (option == nullptr || handle == nullptr) return -1;
   *option = nullptr;
-  _init_senseloom();
+  if (!ensureSensors()) return -1;
   Session* session = gSessions.find(handle);
   if (session == nullptr) return -1;
   ContextSensor* sensor = findSensor(session->name);
@@ -70,7 +72,8 @@ int ctx_close_session(void* handle, ctx_option_t** option) noexcept try {
   std::unique_ptr<Option> merged;
   if (sensor != nullptr) {
     const auto& sessions = sensor->sessions;
-    const auto remaining = std::find_if(sessions.begin(), sessions.end(), [&](auto* other) { return other != session; });
+    const auto remaining =
+        std::find_if(sessions.begin(), sessions.end(), [&](auto* other) { return other != session; });
     if (remaining != sessions.end()) merged = (*remaining)->ownOption().clone();
   }
 

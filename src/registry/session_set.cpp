@@ -1,19 +1,19 @@
 #include "registry/session_set.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace senseloom {
 
 void SessionSet::reserveOne() {
-  if (slots != nullptr && 2 * (count + 1) <= capacity()) return;
-  constexpr uint32_t kFirstShift = 32 - 4;  // 16 slots
+  if (2 * (count + 1) <= mask + 1) return;
+  constexpr size_t kFewestSlots = 16;
   SessionSet larger;
-  larger.shift = slots == nullptr ? kFirstShift : shift - 1;
-  larger.slots = std::make_unique<Session*[]>(larger.capacity());
-  if (slots != nullptr) {
-    for (size_t i = 0; i < capacity(); ++i) {
-      if (slots[i] != nullptr) larger.insert(slots[i]);
-    }
+  larger.mask = std::max(2 * (mask + 1), kFewestSlots) - 1;
+  larger.owned = std::make_unique<Session*[]>(larger.mask + 1);
+  larger.slots = larger.owned.get();
+  for (size_t i = 0; i <= mask; ++i) {
+    if (slots[i] != nullptr) larger.insert(slots[i]);
   }
   *this = std::move(larger);
 }
@@ -30,14 +30,15 @@ void SessionSet::erase(const Session* session) {
   while (slots[hole] != session) hole = next(hole);
   // Close the hole: a later session of the same run of slots moves into it, unless its search begins behind the hole.
   for (size_t i = next(hole); slots[i] != nullptr; i = next(i)) {
-    const size_t distance = (i - home(slots[i])) & (capacity() - 1);
-    if (distance >= ((i - hole) & (capacity() - 1))) {
+    const size_t distance = (i - home(slots[i])) & mask;
+    if (distance >= ((i - hole) & mask)) {
       slots[hole] = slots[i];
       hole = i;
     }
   }
   slots[hole] = nullptr;
   --count;
+  recent = nullptr;
 }
 
 }  // namespace senseloom

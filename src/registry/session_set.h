@@ -15,11 +15,11 @@ class SessionSet {
   constexpr SessionSet() = default;
 
   // The session at that address; null when none of the set is.
-  Session* find(const void* handle) const {
-    if (slots == nullptr) return nullptr;
-    for (size_t i = home(handle);; i = next(i)) {
-      if (slots[i] == handle || slots[i] == nullptr) return slots[i];
-    }
+  Session* find(const void* handle) {
+    if (handle == recent) return recent;  // most often a session gets several records in a row
+    size_t i = home(handle);
+    while (slots[i] != nullptr && slots[i] != handle) i = next(i);
+    return recent = slots[i];
   }
 
   // Makes room for one session more. Throws std::bad_alloc, with the set as it was.
@@ -30,17 +30,19 @@ class SessionSet {
   void erase(const Session* session);
 
  private:
-  // The slot where the search for an address begins. Addresses differ little in their upper bits and not at all in their
-  // lowest; the multiplication carries the difference into the bits that are kept.
-  size_t home(const void* handle) const {
-    return static_cast<size_t>((static_cast<uint32_t>(reinterpret_cast<uintptr_t>(handle) >> 4) * 2654435769U) >> shift);
-  }
-  size_t next(size_t slot) const { return (slot + 1) & (capacity() - 1); }
-  size_t capacity() const { return size_t{1} << (32 - shift); }
+  // The slot where the search for an address begins. Addresses are multiples of a power of 2; the multiplication
+  // carries what differs in them into the bits that are kept.
+  size_t home(const void* handle) const { return (reinterpret_cast<uintptr_t>(handle) * 2654435769U >> 12) & mask; }
+  size_t next(size_t slot) const { return (slot + 1) & mask; }
 
-  std::unique_ptr<Session*[]> slots;  // null where free; at least half are, so that searches are short
-  uint32_t shift = 32;                // the table has 2^(32 - shift) slots
+  // What an empty set searches: one slot, always free.
+  static inline constinit Session* noSlots[1] = {};
+
+  std::unique_ptr<Session*[]> owned;
+  Session** slots = noSlots;  // null where free; at least half are, so that searches are short
+  size_t mask = 0;            // number of slots, a power of 2, minus 1
   size_t count = 0;
+  Session* recent = nullptr;  // what find() found last
 };
 
 }  // namespace senseloom

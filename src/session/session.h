@@ -27,7 +27,7 @@ class Session {
   // Takes one record of `len` bytes. Returns 1 with a result in `*out` and its length in `*outLen`; 0 when there is
   // nothing to deliver and -1 when the record is refused, both with `*out` and `*outLen` untouched. A result is the
   // client's own record, or storage of the session that stays valid until its next record.
-  virtual int postProcess(void* data, int len, void** out, int* outLen) = 0;
+  virtual int postProcess(void* data, int len, void** out, int* outLen) noexcept = 0;
 
   // Starts over with the session's own option and the sensor's merged option, after a negotiation. Returns a negative
   // value, with the session as it was, when that failed.
@@ -51,18 +51,18 @@ class Session {
 };
 
 // The memory of results that a session makes itself: zero-filled, and of malloc(), since it crosses the C interface.
+template <size_t kSize>
 class ResultBuffer {
  public:
-  explicit ResultBuffer(size_t size) : length(size), storage(static_cast<uint8_t*>(std::calloc(1, size))) {
+  ResultBuffer() : storage(static_cast<uint8_t*>(std::calloc(1, kSize))) {
     if (storage == nullptr) throw std::bad_alloc();
   }
-  std::span<uint8_t> bytes() const { return {storage.get(), length}; }
+  std::span<uint8_t, kSize> bytes() const { return std::span<uint8_t, kSize>(storage.get(), kSize); }
 
  private:
   struct Free {
     void operator()(uint8_t* memory) const { std::free(memory); }
   };
-  size_t length;
   std::unique_ptr<uint8_t, Free> storage;
 };
 

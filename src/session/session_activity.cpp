@@ -24,7 +24,20 @@ void _activity_mask_func(void* item, int mask) {
   if (!bitAt(mask, record.classId())) record.withClass(0).storeAt(item);
 }
 
-int _activity_check_seq_func(const void* item) { return item == nullptr ? -1 : ActivityRecord::at(item).sequence(); }
+int _activity_check_seq_func(const void* item) {
+  return item == nullptr ? -1 : ActivityRecord::at(item).sequence();
+}
+
+std::unique_ptr<Proc> SessionActivity::makeChain(const ChainPlan& plan) {
+  std::unique_ptr<Proc> chain =
+      std::make_unique<ProcNM>(ActivityRecord::kSize, _activity_equal_func, _activity_check_seq_func, plan.batch);
+  // The vote counts unmasked classes: a winner that the client did not ask for is delivered as class 0. Change is seen
+  // last, so that a client hears nothing of changes among classes that it did not ask for.
+  if (plan.summary != 0) chain = std::make_unique<ProcMixerActivity>(std::move(chain), plan.weightVar);
+  chain = std::make_unique<ProcMask>(std::move(chain), _activity_mask_func, plan.classMask);
+  if (plan.mode == 1) chain = std::make_unique<ProcChange>(std::move(chain));
+  return chain;
+}
 
 int SessionActivity::buildProc() try {
   const auto* sensor = static_cast<const ContextSensor*>(getSensor(name));
@@ -33,21 +46,26 @@ int SessionActivity::buildProc() try {
   const auto& merged = static_cast<const OptionActivity&>(*sensor->mergedOption);
 
   const auto exponent = static_cast<uint32_t>(wanted.logN() - merged.logM()) & 31U;
-  std::unique_ptr<Proc> chain =
-      std::make_unique<ProcNM>(ActivityRecord::kSize, _activity_equal_func, _activity_check_seq_func,
-                               static_cast<int>(uint32_t{1} << exponent));
-  // The vote counts unmasked classes: a winner that the client did not ask for is delivered as class 0. Change is seen
-  // last, so that a client hears nothing of changes among classes that it did not ask for.
-  if (wanted.summary() != 0) chain = std::make_unique<ProcMixerActivity>(std::move(chain), wanted.weightVar());
-  chain = std::make_unique<ProcMask>(std::move(chain), _activity_mask_func, wanted.classMask());
-  if (wanted.mode() == 1) chain = std::make_unique<ProcChange>(std::move(chain));
-  proc = std::move(chain);
+  const ChainPlan wantedPlan = {
+      .batch = static_cast<int>(uint32_t{1} << exponent),
+      .summary = wanted.summary(),
+      .weightVar = wanted.weightVar(),
+      .classMask = wanted.classMask(),
+      .mode = wanted.mode(),
+  };
+  // Most negotiations concern other sessions and leave this one's chain as it was, but for starting over.
+  if (proc != nullptr && wantedPlan == plan) {
+    proc->restart();
+    return 0;
+  }
+  proc = makeChain(wantedPlan);
+  plan = wantedPlan;
   return 0;
 } catch (const std::bad_alloc&) {
   return -1;  // the old chain stays
 }
 
-int SessionActivity::postProcess(void* data, int len, void** out, int* outLen) {
+int SessionActivity::postProcess(void* data, int len, void** out, int* outLen) noexcept {
   if (out == nullptr || data == nullptr || outLen == nullptr || len < 0) return -1;
   if (proc == nullptr) return passThrough(data, len, out, outLen);
 
@@ -61,9 +79,12 @@ int SessionActivity::postProcess(void* data, int len, void** out, int* outLen) {
     std::memcpy(result.data(), record.data(), std::min(record.size(), result.size()));
   }
   const int count = std::min<int>(loadI16(result, kValueOffset), kMostItems);
-  if (!proc->accept(result.data() + kHeaderSize, count)) return 0;
+  return proc->accept(result.data() + kHeaderSize, count) ? deliver(out, outLen) : 0;
+}
 
-  const int delivered = proc->length();
+int SessionActivity::deliver(void** out, int* outLen) {
+  const auto result = work.bytes();
+  const int delivered = proc->bufferLength();
   const size_t bytes = static_cast<size_t>(delivered) * ActivityRecord::kSize;
   storeU16(result, kValueOffset, static_cast<uint16_t>(delivered));
   std::memcpy(result.data() + kHeaderSize, proc->buffer(), bytes);

@@ -16,13 +16,28 @@ class SessionActivity final : public Session {
  public:
   SessionActivity() : Session(OptionActivity::kind.sensor, std::make_unique<OptionActivity>()) {}
 
-  int postProcess(void* data, int len, void** out, int* outLen) override;
+  int postProcess(void* data, int len, void** out, int* outLen) noexcept override;
   int buildProc() override;
 
  private:
+  // All that the chain is made of.
+  struct ChainPlan {
+    int batch;  // elements
+    int summary;
+    int weightVar;
+    int classMask;
+    int mode;
+    bool operator==(const ChainPlan&) const = default;
+  };
+  static std::unique_ptr<Proc> makeChain(const ChainPlan& plan);
+
+  // Hands out the chain's result. Apart from postProcess(), which most often has none.
+  [[gnu::noinline]] int deliver(void** out, int* outLen);
+
   static constexpr int kMostItems = 256;  // the largest batch: 1 << the largest logN
 
-  ResultBuffer work{10 + 2 * kMostItems};
+  ChainPlan plan{};  // of the chain, while there is one
+  ResultBuffer<10 + 2 * kMostItems> work;
 };
 
 }  // namespace senseloom

@@ -53,9 +53,9 @@ class SessionFilter final : public Session {
  public:
   SessionFilter() : Session(OptionKind::kind.sensor, std::make_unique<OptionKind>()) {}
 
-  int postProcess(void* data, int len, void** out, int* outLen) override {
-    const auto record = recordBytes(data, len);
-    if (record.size() < Filter::kFieldEnd || !Filter::wants(record, static_cast<const OptionKind&>(*option))) return 0;
+  int postProcess(void* data, int len, void** out, int* outLen) noexcept override {
+    if (len < static_cast<int>(Filter::kFieldEnd)) return 0;
+    if (!Filter::wants(recordBytes(data, len), static_cast<const OptionKind&>(*option))) return 0;
     return passThrough(data, len, out, outLen);
   }
 };

@@ -75,7 +75,7 @@ SessionGestureHMM::~SessionGestureHMM() {
   if (--session_num == 0) gesture_close();
 }
 
-int SessionGestureHMM::postProcess(void* data, int len, void** out, int* outLen) {
+int SessionGestureHMM::postProcess(void* data, int len, void** out, int* outLen) noexcept {
   const auto record = recordBytes(data, len);
   if (record.size() < kLeastBytes || record.size() > kMostBytes) return -1;
   if (record.size() < kSamplesOffset + loadU16(record, kSizeOffset)) return -1;

@@ -14,12 +14,12 @@ class SessionGestureHMM final : public Session {
   SessionGestureHMM();
   ~SessionGestureHMM() override;
 
-  int postProcess(void* data, int len, void** out, int* outLen) override;
+  int postProcess(void* data, int len, void** out, int* outLen) noexcept override;
 
  private:
   static constexpr int kMostBytes = 2052;  // the largest record
 
-  ResultBuffer work{kMostBytes};
+  ResultBuffer<kMostBytes> work;
 };
 
 }  // namespace senseloom

@@ -6,7 +6,7 @@
 
 namespace senseloom {
 
-int SessionPDR::postProcess(void* data, int len, void** out, int* outLen) {
+int SessionPDR::postProcess(void* data, int len, void** out, int* outLen) noexcept {
   const auto record = recordBytes(data, len);
   if (record.size() < kHeaderSize) return -1;
   const int count = loadI16(record, kValueOffset);
@@ -14,18 +14,22 @@ int SessionPDR::postProcess(void* data, int len, void** out, int* outLen) {
   const auto added = static_cast<size_t>(count * kItemSize);
   if (record.size() < kHeaderSize + added) return -1;
 
-  const auto result = work.bytes();
-  const size_t end = kHeaderSize + static_cast<size_t>(pendingCount * kItemSize);
-  std::memcpy(result.data() + end, record.data() + kHeaderSize, added);
+  uint8_t* const end = work.bytes().data() + kHeaderSize + pendingCount * kItemSize;
+  for (size_t done = 0; done < added; done += kItemSize) {  // mostly once, for which a copy of a known size is quickest
+    std::memcpy(end + done, record.data() + kHeaderSize + done, kItemSize);
+  }
   pendingCount += count;
   const int threshold = 1 << static_cast<const OptionPDR&>(*option).N();  // 0 to 6
-  if (pendingCount < threshold) return 0;
+  return pendingCount < threshold ? 0 : deliver(record, out, outLen);
+}
 
-  std::memcpy(result.data() + kTimestampOffset, record.data() + kTimestampOffset, kTimestampSize);
+int SessionPDR::deliver(std::span<const uint8_t> lastRecord, void** out, int* outLen) {
+  const auto result = work.bytes();
+  std::memcpy(result.data() + kTimestampOffset, lastRecord.data() + kTimestampOffset, kTimestampSize);
   storeU16(result, kValueOffset, static_cast<uint16_t>(pendingCount));
-  pendingCount = 0;
   *out = result.data();
-  *outLen = static_cast<int>(end + added);
+  *outLen = static_cast<int>(kHeaderSize) + pendingCount * kItemSize;
+  pendingCount = 0;
   return 1;
 }
 

@@ -11,13 +11,16 @@ class SessionPDR final : public Session {
  public:
   SessionPDR() : Session(OptionPDR::kind.sensor, std::make_unique<OptionPDR>()) {}
 
-  int postProcess(void* data, int len, void** out, int* outLen) override;
+  int postProcess(void* data, int len, void** out, int* outLen) noexcept override;
 
  private:
+  // Hands out what is pending. Apart from postProcess(), which most often has too little.
+  [[gnu::noinline]] int deliver(std::span<const uint8_t> lastRecord, void** out, int* outLen);
+
   static constexpr int kMostItems = 64;  // 2^N for the largest N
   static constexpr int kItemSize = 28;   // bytes; what they mean is between the sensor and the client
 
-  ResultBuffer work{10 + kMostItems * kItemSize};
+  ResultBuffer<10 + kMostItems * kItemSize> work;
   int32_t pendingCount = 0;  // items in `work` that are not delivered yet
 };
 

@@ -9,7 +9,7 @@ int SessionStepCount::parseOption(const char* text) {
   return 0;
 }
 
-int SessionStepCount::postProcess(void* data, int len, void** out, int* outLen) {
+int SessionStepCount::postProcess(void* data, int len, void** out, int* outLen) noexcept {
   const auto& wanted = static_cast<const OptionStepCount&>(*option);
   if (wanted.mode() == 1) return passThrough(data, len, out, outLen);
 

@@ -12,7 +12,7 @@ class SessionStepCount final : public Session {
 
   // Accepts every string, on purpose: one that can not be read leaves the option as it was.
   int parseOption(const char* text) override;
-  int postProcess(void* data, int len, void** out, int* outLen) override;
+  int postProcess(void* data, int len, void** out, int* outLen) noexcept override;
 };
 
 }  // namespace senseloom
