@@ -1,0 +1,35 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <cstdio>
+
+namespace senseloom::tool {
+
+// Writes the trace of a day's commute as an activity classifier gives it: mostly one decision a record, now and then
+// several; flicker and short misclassifications; and three clients that join and leave with different options. The
+// seed decides everything, in integer arithmetic alone, so that it gives the same bytes everywhere.
+class CommuteGenerator {
+ public:
+  CommuteGenerator(std::FILE* stream, uint64_t seed, uint32_t recordCount)
+      : out(stream), randomState(seed), records(recordCount) {}
+  void write();
+
+ private:
+  uint64_t random();
+  uint32_t randomBelow(uint32_t bound);
+  int observe(int activity);
+  void writeRecord(int activity);
+
+  std::FILE* out;
+  uint64_t randomState;
+  uint32_t records;
+
+  uint64_t timestamp = (6 * 60 + 50) * 60 * 1000;  // milliseconds since midnight: ten to seven
+  uint32_t sequence = 0;
+  // The class that the classifier takes the activity for, and for how many more decisions.
+  int mistaken = 0;
+  uint32_t mistakes = 0;
+};
+
+}  // namespace senseloom::tool

@@ -1,0 +1,21 @@
+#pragma once
+
+#include <cstdint>
+#include <span>
+#include <string_view>
+
+#include "option/option_description.h"
+
+// The library's descriptions of its options, which are data. Of what is code in the library the tool uses nothing but
+// the public interface.
+namespace senseloom::tool {
+
+// One description a sensor.
+std::span<const OptionDescription* const> optionDescriptions();
+// Null when there is no such sensor.
+const OptionDescription* findOptionDescription(std::string_view sensor);
+
+// The name of a sensor's property; "?" when the sensor has no property of that id.
+const char* propertyName(std::string_view sensor, int32_t id);
+
+}  // namespace senseloom::tool
