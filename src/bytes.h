@@ -42,6 +42,15 @@ inline void storeI32(std::span<uint8_t> bytes, size_t offset, int32_t value) {
   store(bytes, offset, value);
 }
 
+// Copies elements of a batch: most often a single one of 16 bits, which takes less than a call of memcpy().
+inline void copyElements(uint8_t* to, const void* from, size_t bytes) {
+  if (bytes == sizeof(uint16_t)) {
+    std::memcpy(to, from, sizeof(uint16_t));
+  } else {
+    std::memcpy(to, from, bytes);
+  }
+}
+
 // The bit of `mask` at `position`, taken modulo 32.
 inline bool bitAt(int32_t mask, int32_t position) {
   return (static_cast<uint32_t>(mask) >> (static_cast<uint32_t>(position) & 31U) & 1U) != 0;

@@ -1,7 +1,8 @@
 #include "proc/proc_nm.h"
 
 #include <algorithm>
-#include <cstring>
+
+#include "bytes.h"
 
 namespace senseloom {
 
@@ -12,7 +13,7 @@ ProcNM::ProcNM(int elementSize, EqualFunc equal, CheckSeqFunc checkSeq, int buff
 bool ProcNM::gather(const void* data, int count) {
   const int taken = std::min(count, bufferLength() - filled);
   if (taken <= 0) return false;
-  std::memcpy(buffer() + filled * elemSize, data, static_cast<size_t>(taken * elemSize));
+  copyElements(buffer() + filled * elemSize, data, static_cast<size_t>(taken * elemSize));
   filled += taken;
   return filled == bufferLength();
 }

@@ -87,7 +87,7 @@ int SessionActivity::deliver(void** out, int* outLen) {
   const int delivered = proc->bufferLength();
   const size_t bytes = static_cast<size_t>(delivered) * ActivityRecord::kSize;
   storeU16(result, kValueOffset, static_cast<uint16_t>(delivered));
-  std::memcpy(result.data() + kHeaderSize, proc->buffer(), bytes);
+  copyElements(result.data() + kHeaderSize, proc->buffer(), bytes);
   proc->reset();
   *out = result.data();
   *outLen = static_cast<int>(kHeaderSize + bytes);
