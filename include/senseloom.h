@@ -13,8 +13,9 @@
  *  3. Handles: a session handle is an opaque pointer. It is valid from ctx_open_session() until it is passed to
  *     ctx_close_session(); a closed handle is refused with -1, until a later session happens to get the same value.
  *  4. Records and results: integers are in the platform's byte order, little-endian on the target. Records need no
- *     alignment. A result is either the caller's own record handed back or storage of the session: it is never freed by
- *     the caller, and stays valid until the next record of that session or until the session is closed.
+ *     alignment, and the library never writes to one. A result is either the caller's own record handed back or storage
+ *     of the session: it is never freed by the caller, and stays valid until the next record of that session or until
+ *     the session is closed.
  *  5. Log lines go to the Android log (liblog): tag "libsenseloom" for options and sessions, "Libsl" for negotiation,
  *     "STY" for the instant-activity option and "aware_audio" for the audio bridge.
  */

@@ -8,7 +8,7 @@ set -euo pipefail
 # Per task: packages that are programs or headers, and libraries, which 32-bit x86 needs in its own version, too.
 declare -A programs=(
   [build]="g++ cmake ninja-build libcli11-dev"
-  [test]="binutils"
+  [test]="abigail-tools binutils clang dpkg-dev file groff-base libc++-dev pkg-config"
 )
 declare -A libraries=(
   [build]="libjansson-dev android-liblog-dev"

@@ -31,6 +31,8 @@ constinit std::array<ContextSensor*, kSensors> gSensors{};
 
 }  // namespace
 
+constinit SessionSet gSessions;
+
 bool _init_senseloom() noexcept try {
   std::array<std::unique_ptr<ContextSensor>, kSensors> sensors;
   for (size_t i = 0; i < kSensors; ++i) sensors[i] = kSensorKinds[i].makeSensor();

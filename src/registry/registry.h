@@ -6,7 +6,7 @@
 namespace senseloom {
 
 // The sessions that are open, on any sensor or on none any more (see ctx_uninit()).
-inline constinit SessionSet gSessions;
+[[gnu::visibility("hidden")]] extern constinit SessionSet gSessions;
 
 // Whether the sensors are there.
 inline constinit bool gInited = false;

@@ -1,0 +1,18 @@
+#pragma once
+
+#include <cstddef>
+
+// The memory of the library while it works on a call: what it has from malloc(), calloc(), realloc() and operator new,
+// by itself or through the JSON parser. What the platform and the test allocate is not watched and never fails.
+namespace memory {
+
+// Lets the allocation `which` of those to come fail, from 1; with `forEver` all later ones, too.
+void failAt(size_t which, bool forEver);
+// Lets no more fail. Returns whether any did.
+bool stopFailing();
+
+// Blocks that the library has allocated and that were not freed yet, and their bytes.
+size_t blocks();
+size_t bytes();
+
+}  // namespace memory

@@ -1,0 +1,69 @@
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <utility>
+#include <vector>
+
+// The calls of a client as data: made up at random, made on the library and on the model of it, shrunk, and written as a
+// trace.
+namespace oracle {
+
+using Bytes = std::vector<uint8_t>;
+
+// The sensors in the library's order; a call names one by its place here.
+constexpr int kSensors = 12;
+enum Kind { phyac, stap, gsflk, shaki, isact, scoun, gspx, dtwgs, gseth, lpe, pdr, lift };
+constexpr const char* kSensorNames[kSensors] = {"PHYAC", "STAP",  "GSFLK", "SHAKI", "ISACT", "SCOUN",
+                                                "GSPX",  "DTWGS", "GSETH", "LPE_P", "PDR",   "LIFT"};
+
+// What the platform answers during a call.
+struct Answers {
+  int get = 0;       // the loader
+  int open = 0;      // the module
+  bool gives = true; // whether a successful open gives a device
+  uint32_t version = 0x200;
+  int activate = 0;
+  int deactivate = 0;
+  bool starts = true;                             // the gesture engine
+  std::vector<std::optional<std::string>> names;  // its answers to the groups of samples; none left: no gesture
+
+  bool operator==(const Answers&) const = default;
+};
+
+// An option string: members with their values as JSON text, or text as it stands, or a null pointer.
+struct OptionText {
+  std::vector<std::pair<std::string, std::string>> members;
+  std::optional<std::string> verbatim;
+  bool isNull = false;
+
+  std::string text() const;
+};
+
+struct Call {
+  enum What { open, setOption, dispatch, dispatchToSensor, close, uninit, audioInit, audioActivate, audioDeactivate, find };
+  // Misuses, which no trace can express.
+  enum Misuse { none, nullName, longName, nullOut, nullLength, nullData, negativeLength, staleHandle };
+
+  What what = uninit;
+  int session = 0;   // of open, setOption, dispatch and close: the client's name for it, a small number
+  int sensor = 0;    // of open, dispatchToSensor and find
+  OptionText option; // of setOption
+  Bytes record;      // of a dispatch
+  Misuse misuse = none;
+  Answers answers;
+};
+using Sequence = std::vector<Call>;
+
+// Whether a trace can express the call.
+bool isTraceable(const Call& call);
+
+// The call on one line of JSON, as `senseloom replay` reads it. What the tool does not know of, the platform's answers
+// and calls that are not traceable, is in members that it skips.
+std::string toJson(const Call& call);
+
+// A sequence as a trace that `senseloom replay` runs. Calls that are not traceable are notes of the next one that is.
+std::string toTrace(const Sequence& sequence);
+
+}  // namespace oracle

@@ -1,0 +1,136 @@
+#include "registry/registry.h"
+
+#include <gtest/gtest.h>
+
+#include <set>
+#include <string>
+
+#include "allocations.h"
+#include "fake_option.h"
+#include "fake_platform.h"
+#include "fake_session.h"
+
+// Each of these tests needs a fresh process, in which no sensor was ever made.
+namespace senseloom {
+namespace {
+
+using Events = std::vector<std::string>;
+
+// In the order in which they are made and deleted.
+const char* const kNames[] = {"PHYAC", "STAP",  "GSFLK", "SHAKI", "ISACT", "SCOUN",
+                              "GSPX",  "DTWGS", "GSETH", "LPE_P", "PDR",   "LIFT"};
+
+void expectNoSensors() {
+  for (const char* name : kNames) EXPECT_EQ(findSensor(name), nullptr) << name;
+}
+
+class Registry : public testing::Test {
+ protected:
+  void TearDown() override { ctx_uninit(); }
+};
+
+TEST_F(Registry, IsEmptyUntilItIsInitialised) {
+  expectNoSensors();
+  ctx_uninit();
+  expectNoSensors();
+}
+
+TEST_F(Registry, HasTwelveSensorsByName) {
+  ASSERT_TRUE(ensureSensors());
+  std::set<ContextSensor*> sensors;
+  for (const char* name : kNames) {
+    ContextSensor* sensor = findSensor(name);
+    ASSERT_NE(sensor, nullptr) << name;
+    EXPECT_STREQ(sensor->createSession()->name, name);
+    EXPECT_EQ(sensor->mergedOption, nullptr);
+    EXPECT_TRUE(sensor->sessions.empty());
+    sensors.insert(sensor);
+  }
+  EXPECT_EQ(sensors.size(), 12U);
+}
+
+TEST_F(Registry, MatchesNamesExactly) {
+  ASSERT_TRUE(ensureSensors());
+  for (const char* name : {"", "phyac", "PHYA", "PHYAC ", " PHYAC", "PHYACX", "Pdr", "LPE", "GSPXGSPXGSPX"}) {
+    EXPECT_EQ(findSensor(name), nullptr) << name;
+  }
+  EXPECT_EQ(findSensor(nullptr), nullptr);
+}
+
+TEST_F(Registry, IsInitialisedOnce) {
+  ASSERT_TRUE(ensureSensors());
+  ContextSensor* sensors[12];
+  for (size_t i = 0; i < 12; ++i) sensors[i] = findSensor(kNames[i]);
+  const fake::AllocationCount allocations;
+  ASSERT_TRUE(ensureSensors());
+  EXPECT_EQ(allocations.made(), 0U);
+  for (size_t i = 0; i < 12; ++i) EXPECT_EQ(findSensor(kNames[i]), sensors[i]) << kNames[i];
+}
+
+TEST_F(Registry, SensorsAreDeletedInTheirOrder) {
+  ASSERT_TRUE(ensureSensors());
+  Events events;
+  Events expected;
+  for (const char* name : kNames) {
+    findSensor(name)->mergedOption = std::make_unique<fake::NamedOption>(name, events);
+    expected.push_back(std::string(name) + " destroyed");
+  }
+  ctx_uninit();
+  EXPECT_EQ(events, expected);
+  ctx_uninit();
+  EXPECT_EQ(events, expected) << "there is nothing left to delete";
+}
+
+TEST_F(Registry, KeepsThePointersToDeletedSensors) {
+  ASSERT_TRUE(ensureSensors());
+  ContextSensor* sensors[12];
+  for (size_t i = 0; i < 12; ++i) sensors[i] = findSensor(kNames[i]);
+  ctx_uninit();
+  for (size_t i = 0; i < 12; ++i) EXPECT_EQ(findSensor(kNames[i]), sensors[i]) << kNames[i];
+}
+
+TEST_F(Registry, HasNewSensorsAfterTheNextInitialisation) {
+  ASSERT_TRUE(ensureSensors());
+  Events events;
+  fake::NamedSession session("STAP", "a", events);
+  for (const char* name : kNames) {
+    findSensor(name)->sessions.push_back(&session);
+    findSensor(name)->mergedOption = std::make_unique<fake::NamedOption>(name, events);
+  }
+  ctx_uninit();
+  ASSERT_TRUE(ensureSensors());
+  for (const char* name : kNames) {
+    EXPECT_TRUE(findSensor(name)->sessions.empty()) << name;
+    EXPECT_EQ(findSensor(name)->mergedOption, nullptr) << name;
+  }
+}
+
+TEST_F(Registry, UninitialisingNeitherTouchesSessionsNorStopsSensors) {
+  ASSERT_TRUE(ensureSensors());
+  ASSERT_TRUE(findSensor("LPE_P")->onStart());
+  fake::platform().calls.clear();
+  auto session = std::make_unique<fake::NamedSession>("LPE_P", "a", fake::platform().calls);
+  findSensor("LPE_P")->sessions.push_back(session.get());
+  gSessions.reserveOne();
+  gSessions.insert(session.get());
+  ctx_uninit();
+  EXPECT_EQ(fake::platform().calls, Events{});
+  EXPECT_TRUE(gIsActivated);
+  EXPECT_EQ(gSessions.find(session.get()), session.get());
+  gSessions.erase(session.get());
+}
+
+TEST_F(Registry, MakesAllSensorsOrNone) {
+  size_t failures = 0;
+  for (;; ++failures) {
+    const fake::FailingAllocation next(failures + 1);
+    if (ensureSensors()) break;
+    expectNoSensors();
+    EXPECT_FALSE(gInited);
+  }
+  EXPECT_EQ(failures, 12U);
+  for (const char* name : kNames) EXPECT_NE(findSensor(name), nullptr) << name;
+}
+
+}  // namespace
+}  // namespace senseloom

@@ -1,0 +1,138 @@
+#include "registry/session_set.h"
+
+#include <gtest/gtest.h>
+
+#include <new>
+#include <ostream>
+#include <set>
+
+#include "allocations.h"
+#include "random_numbers.h"
+
+namespace senseloom {
+namespace {
+
+// The set looks at addresses alone, so no session needs to be there.
+Session* sessionAt(uintptr_t address) {
+  return reinterpret_cast<Session*>(address);
+}
+
+void insert(SessionSet& set, Session* session) {
+  set.reserveOne();
+  set.insert(session);
+}
+
+// Candidates for members, at equal distances or at random.
+struct Candidates {
+  const char* name;
+  uintptr_t distance;  // 0: at random
+};
+void PrintTo(const Candidates& candidates, std::ostream* out) {
+  *out << candidates.name;
+}
+
+constexpr uint32_t kCandidates = 600;
+
+class RandomSet : public testing::TestWithParam<Candidates> {
+ protected:
+  void SetUp() override {
+    std::set<uintptr_t> addresses;
+    while (addresses.size() < kCandidates) {
+      const uintptr_t distance = GetParam().distance;
+      addresses.insert(distance == 0 ? uintptr_t{random.next()} << 4 | 0x10 : 0x1000 + distance * addresses.size());
+    }
+    for (const uintptr_t address : addresses) candidates.push_back(sessionAt(address));
+  }
+
+  // Whether all candidates are found or not as they should be, and nothing beside them is found.
+  bool isAsExpected() {
+    for (Session* candidate : candidates) {
+      if (set.find(candidate) != (expected.contains(candidate) ? candidate : nullptr)) return false;
+      if (set.find(reinterpret_cast<char*>(candidate) + 1) != nullptr) return false;
+    }
+    return true;
+  }
+
+  RandomNumbers random;
+  std::vector<Session*> candidates;
+  std::set<Session*> expected;
+  SessionSet set;
+};
+
+TEST_P(RandomSet, HoldsWhatWasInsertedAndNotErased) {
+  // The share of insertions rises and falls, so that the set is filled and emptied again.
+  for (const uint32_t share : {90U, 50U, 10U, 60U, 0U}) {
+    for (int step = 0; step < 3000; ++step) {
+      Session* candidate = candidates[random.below(kCandidates)];
+      if (random.below(100) < share) {
+        if (expected.insert(candidate).second) insert(set, candidate);
+      } else if (expected.erase(candidate) != 0) {
+        set.erase(candidate);
+      }
+      ASSERT_EQ(set.find(candidate), expected.contains(candidate) ? candidate : nullptr) << share << ' ' << step;
+      if (step % 100 == 0) {
+        ASSERT_TRUE(isAsExpected()) << share << ' ' << step;
+      }
+    }
+    ASSERT_TRUE(isAsExpected()) << share;
+  }
+}
+
+INSTANTIATE_TEST_SUITE_P(Addresses, RandomSet,
+                         testing::Values(Candidates{"Dense", 16}, Candidates{"OfALine", 64},
+                                         Candidates{"OfAPage", 4096}, Candidates{"OfALargePage", 65536},
+                                         Candidates{"OfAMegabyte", 1 << 20}, Candidates{"Random", 0}),
+                         [](const auto& tested) { return std::string(tested.param.name); });
+
+TEST(SessionSet, FindsNothingAtFirst) {
+  SessionSet set;
+  EXPECT_EQ(set.find(sessionAt(16)), nullptr);
+  EXPECT_EQ(set.find(nullptr), nullptr);
+  set.reserveOne();
+  EXPECT_EQ(set.find(sessionAt(16)), nullptr);
+  EXPECT_EQ(set.find(nullptr), nullptr);
+}
+
+TEST(SessionSet, RoomThatWasNotUsedIsKept) {
+  SessionSet set;
+  set.reserveOne();
+  const fake::AllocationCount allocations;
+  for (int i = 0; i < 100; ++i) set.reserveOne();
+  EXPECT_EQ(allocations.made(), 0U);
+  set.insert(sessionAt(16));
+  EXPECT_EQ(set.find(sessionAt(16)), sessionAt(16));
+}
+
+TEST(SessionSet, RoomOfErasedSessionsIsUsedAgain) {
+  SessionSet set;
+  insert(set, sessionAt(16));
+  const fake::AllocationCount allocations;
+  for (uintptr_t i = 2; i < 1000; ++i) {
+    set.erase(sessionAt(16 * (i - 1)));
+    insert(set, sessionAt(16 * i));
+  }
+  EXPECT_EQ(allocations.made(), 0U);
+}
+
+TEST(SessionSet, StaysAsItWasWhenItCanNotGrow) {
+  SessionSet set;
+  int failures = 0;
+  for (uintptr_t i = 1; i <= 100; ++i) {
+    {
+      const fake::FailingAllocation first(1);
+      try {
+        set.reserveOne();
+      } catch (const std::bad_alloc&) {
+        ++failures;
+      }
+    }
+    for (uintptr_t earlier = 1; earlier < i; ++earlier) {
+      ASSERT_EQ(set.find(sessionAt(16 * earlier)), sessionAt(16 * earlier)) << i;
+    }
+    insert(set, sessionAt(16 * i));
+  }
+  EXPECT_GE(failures, 2);
+}
+
+}  // namespace
+}  // namespace senseloom
