@@ -1,0 +1,10 @@
+#pragma once
+#include <stddef.h>
+#ifdef __cplusplus
+extern "C" {
+#endif
+typedef struct __sFILE FILE;
+int puts(const char*);
+#ifdef __cplusplus
+}
+#endif

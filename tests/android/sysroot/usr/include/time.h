@@ -1,0 +1,3 @@
+#pragma once
+// For the C++ library.
+typedef long time_t;
