@@ -14,7 +14,8 @@
 #include <unordered_map>
 #include <utility>
 
-// The linker sends each reference to a function F of the list in CMakeLists.txt to __wrap_F, and to F those to __real_F.
+// The linker sends each reference to a function F of the list in CMakeLists.txt to __wrap_F, and to F those to
+// __real_F.
 
 extern "C" {
 void* __real_malloc(size_t size);
@@ -110,19 +111,35 @@ bool stopFailing() {
   return has_failed;
 }
 
-size_t blocks() { return liveBlocks().size(); }
-size_t bytes() { return live_bytes; }
+size_t blocks() {
+  return liveBlocks().size();
+}
+size_t bytes() {
+  return live_bytes;
+}
 
 }  // namespace memory
 
 // --- the allocating functions
 
-void* operator new(size_t size) { return newBlock(size); }
-void* operator new[](size_t size) { return newBlock(size); }
-void operator delete(void* block) noexcept { std::free(block); }
-void operator delete(void* block, size_t) noexcept { std::free(block); }
-void operator delete[](void* block) noexcept { std::free(block); }
-void operator delete[](void* block, size_t) noexcept { std::free(block); }
+void* operator new(size_t size) {
+  return newBlock(size);
+}
+void* operator new[](size_t size) {
+  return newBlock(size);
+}
+void operator delete(void* block) noexcept {
+  std::free(block);
+}
+void operator delete(void* block, size_t) noexcept {
+  std::free(block);
+}
+void operator delete[](void* block) noexcept {
+  std::free(block);
+}
+void operator delete[](void* block, size_t) noexcept {
+  std::free(block);
+}
 
 extern "C" {
 

@@ -245,6 +245,16 @@ TEST_F(Activity, BatchSizeIsTheSessionsSpanInStepsOfTheSensorsSmallest) {
   EXPECT_EQ(batchSize(other), 64);
 }
 
+TEST_F(Activity, SessionVotesByItsOwnOptionWhoeverNegotiatesLast) {
+  EXPECT_EQ(setOption(client_, R"({"logN": 1, "weightVar": 1})").result, 0);
+  void* const other = open(R"({"logN": 1, "summary": 0, "mode": 1, "classMask": 4})");
+  const Bytes pair = activity(1, {0x0052, 0x0063});
+  const Bytes again = activity(2, {0x0052, 0x0063});
+  EXPECT_EQ(dispatch(client_, pair), made(activity(1, {0x0053})));  // 1536 of 2560
+  EXPECT_EQ(dispatch(client_, again), made(activity(2, {0x0053})));
+  EXPECT_EQ(dispatch(other, pair), made(activity(1, {0x0052, 0x0060})));
+}
+
 TEST_F(Activity, ResultsOfASessionAreInOneBufferOfItsOwn) {
   void* const other = open("{}");
   const auto addressOfResult = [](void* handle, uint16_t item) {

@@ -241,7 +241,8 @@ TEST(FailedAllocation, LeaksNothing) {
   }
 }
 
-// What the session's own option took of the string stays, and is in force from the negotiation on, though without a list.
+// What the session's own option took of the string stays, and is in force from the negotiation on, though without a
+// list.
 TEST(FailedAllocation, SetsNoOptionByHalf) {
   bool succeeded = false;
   for (int failing = 0; !succeeded; ++failing) {

@@ -13,14 +13,22 @@ struct Release {
 };
 using Json = std::unique_ptr<json_t, Release>;
 
-constexpr const char* kCallNames[] = {"open",           "set_option",         "dispatch",
-                                      "dispatch",       "close",              "uninit",
-                                      "audio_hal_init", "audio_hal_activate", "audio_hal_deactivate",
+constexpr const char* kCallNames[] = {"open",
+                                      "set_option",
+                                      "dispatch",
+                                      "dispatch",
+                                      "close",
+                                      "uninit",
+                                      "audio_hal_init",
+                                      "audio_hal_activate",
+                                      "audio_hal_deactivate",
                                       "getSensor"};
 constexpr const char* kMisuseNames[] = {"",          "null name",       "long name",   "null out", "null length",
                                         "null data", "negative length", "stale handle"};
 
-void add(const Json& object, const char* key, json_t* value) { json_object_set_new(object.get(), key, value); }
+void add(const Json& object, const char* key, json_t* value) {
+  json_object_set_new(object.get(), key, value);
+}
 
 // JSON text is UTF-8; bytes that are not, which only raw option strings have, are written as if they were Latin-1.
 json_t* textOf(const std::string& text) {
@@ -114,9 +122,13 @@ std::string OptionText::text() const {
   return text + '}';
 }
 
-bool isTraceable(const Call& call) { return call.misuse == Call::none && call.what <= Call::uninit; }
+bool isTraceable(const Call& call) {
+  return call.misuse == Call::none && call.what <= Call::uninit;
+}
 
-std::string toJson(const Call& call) { return textOf(objectOf(call)); }
+std::string toJson(const Call& call) {
+  return textOf(objectOf(call));
+}
 
 std::string toTrace(const Sequence& sequence) {
   std::string trace;

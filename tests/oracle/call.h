@@ -6,8 +6,8 @@
 #include <utility>
 #include <vector>
 
-// The calls of a client as data: made up at random, made on the library and on the model of it, shrunk, and written as a
-// trace.
+// The calls of a client as data: made up at random, made on the library and on the model of it, shrunk, and written as
+// a trace.
 namespace oracle {
 
 using Bytes = std::vector<uint8_t>;
@@ -20,9 +20,9 @@ constexpr const char* kSensorNames[kSensors] = {"PHYAC", "STAP",  "GSFLK", "SHAK
 
 // What the platform answers during a call.
 struct Answers {
-  int get = 0;       // the loader
-  int open = 0;      // the module
-  bool gives = true; // whether a successful open gives a device
+  int get = 0;        // the loader
+  int open = 0;       // the module
+  bool gives = true;  // whether a successful open gives a device
   uint32_t version = 0x200;
   int activate = 0;
   int deactivate = 0;
@@ -42,15 +42,26 @@ struct OptionText {
 };
 
 struct Call {
-  enum What { open, setOption, dispatch, dispatchToSensor, close, uninit, audioInit, audioActivate, audioDeactivate, find };
+  enum What {
+    open,
+    setOption,
+    dispatch,
+    dispatchToSensor,
+    close,
+    uninit,
+    audioInit,
+    audioActivate,
+    audioDeactivate,
+    find
+  };
   // Misuses, which no trace can express.
   enum Misuse { none, nullName, longName, nullOut, nullLength, nullData, negativeLength, staleHandle };
 
   What what = uninit;
-  int session = 0;   // of open, setOption, dispatch and close: the client's name for it, a small number
-  int sensor = 0;    // of open, dispatchToSensor and find
-  OptionText option; // of setOption
-  Bytes record;      // of a dispatch
+  int session = 0;    // of open, setOption, dispatch and close: the client's name for it, a small number
+  int sensor = 0;     // of open, dispatchToSensor and find
+  OptionText option;  // of setOption
+  Bytes record;       // of a dispatch
   Misuse misuse = none;
   Answers answers;
 };

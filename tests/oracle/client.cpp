@@ -11,7 +11,8 @@
 
 // The library's one message on standard output is a call of the platform like the others.
 extern "C" int puts(const char* text) {
-  if (std::string_view(text).substr(0, 12) != "deactivating") return std::fputs(text, stdout) < 0 ? EOF : std::fputc('\n', stdout);
+  if (std::string_view(text).substr(0, 12) != "deactivating")
+    return std::fputs(text, stdout) < 0 ? EOF : std::fputc('\n', stdout);
   fake::platform().calls.push_back(std::string("puts ") + text);
   return 0;
 }
@@ -20,9 +21,9 @@ namespace oracle {
 namespace {
 
 constexpr int kUntouched = -12345;
-constexpr uint8_t kBlock[48] = {128,  0,    0, 0, 12,   0,    20, 0, 24,   0,    0, 0, 76,  0,  0, 0,
+constexpr uint8_t kBlock[48] = {128,  0,    0,    0,    12,   0,    20,   0,    24,   0,    0, 0, 76,   0,    0, 0,
                                 0xFE, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 21,   0,    0, 0, 0xCC, 0x3C, 0, 0,
-                                0x70, 0x7D, 0, 0, 0x99, 0x19, 0,  0, 0xCC, 0x0C, 0, 0, 64,  0,  4, 0};
+                                0x70, 0x7D, 0,    0,    0x99, 0x19, 0,    0,    0xCC, 0x0C, 0, 0, 64,   0,    4, 0};
 
 void* const kUntouchedPointer = const_cast<int*>(&kUntouched);
 
@@ -161,9 +162,9 @@ Observation Client::dispatch(const Call& call, void* handle) {
   void* result = kUntouchedPointer;
   int length = kUntouched;
   const int len = call.misuse == Call::negativeLength ? -1 : static_cast<int>(call.record.size());
-  const int returned =
-      ctx_dispatch_data(handle, call.misuse == Call::nullData ? nullptr : record.get(), len,
-                        call.misuse == Call::nullOut ? nullptr : &result, call.misuse == Call::nullLength ? nullptr : &length);
+  const int returned = ctx_dispatch_data(handle, call.misuse == Call::nullData ? nullptr : record.get(), len,
+                                         call.misuse == Call::nullOut ? nullptr : &result,
+                                         call.misuse == Call::nullLength ? nullptr : &length);
   observation.outcome.returned = returned;
   if (!std::equal(call.record.begin(), call.record.end(), record.get())) {
     observation.complaint += "the client's record was changed; ";
@@ -298,9 +299,15 @@ Outcome makeOnModel(Model& model, const Call& call, const void* handle, const vo
 
 namespace {
 
-std::string words(int number) { return std::to_string(number); }
-std::string words(bool yes) { return yes ? "yes" : "no"; }
-std::string words(const std::string& text) { return text; }
+std::string words(int number) {
+  return std::to_string(number);
+}
+std::string words(bool yes) {
+  return yes ? "yes" : "no";
+}
+std::string words(const std::string& text) {
+  return text;
+}
 std::string words(const fake::LogLine& line) {
   return std::to_string(line.priority) + ' ' + line.tag + ": \"" + line.text + '"';
 }
@@ -324,7 +331,9 @@ std::string words(const std::vector<Element>& elements) {
   for (const Element& element : elements) text += ' ' + words(element);
   return text + " ]";
 }
-std::string words(const std::optional<PropertyList>& list) { return list ? words(*list) : "null"; }
+std::string words(const std::optional<PropertyList>& list) {
+  return list ? words(*list) : "null";
+}
 
 template <class Value>
 void compare(std::string& text, const char* what, const Value& expected, const Value& actual) {

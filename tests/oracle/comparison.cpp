@@ -45,7 +45,8 @@ std::string Comparison::make(const Call& call, void* handle) {
   }
   const Outcome expected = makeOnModel(model, call, handle, observation.opened);
   std::string text = observation.complaint + difference(expected, observation.outcome);
-  if (call.what == Call::close && call.misuse != Call::nullOut && !model.isLive(handle)) client.noteClosed(call, handle);
+  if (call.what == Call::close && call.misuse != Call::nullOut && !model.isLive(handle))
+    client.noteClosed(call, handle);
   // A stale handle can have become that of a session on any sensor.
   if (call.misuse == Call::staleHandle) {
     ctx_option_release(observation.list);

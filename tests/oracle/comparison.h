@@ -27,6 +27,7 @@ struct Difference {
 
 // Makes the calls of a sequence on the library and on the model, closes what it leaves open, and leaves the library as
 // it was. Returns the first difference, if there is one. Calls for sessions that are not open are left out.
-std::optional<Difference> compare(const Sequence& sequence, Mistake mistake = Mistake::none, Tallies* tallies = nullptr);
+std::optional<Difference> compare(const Sequence& sequence, Mistake mistake = Mistake::none,
+                                  Tallies* tallies = nullptr);
 
 }  // namespace oracle

@@ -43,16 +43,29 @@ const std::vector<Key> kKeys[kSensors] = {
 };
 
 constexpr const char* kNotIntegers[] = {"\"3\"", "2.0", "true", "null", "[1]", "{}", "1e2"};
-constexpr int64_t kOddIntegers[] = {
-    -1,         31,          32,         100,        101,         255,
-    256,        65535,       65536,      2147483647, 2147483648,  -2147483648,
-    4294967295, 4294967296,  4294967297, -7,         -2147483649, std::numeric_limits<int64_t>::max(),
-    1000000,    std::numeric_limits<int64_t>::min()};
-constexpr const char* kStrings[] = {"", "{", "{\"mode\":1,}", "sitting", "null", "[]", "[1]", "{\"logN\":1}}",
+constexpr int64_t kOddIntegers[] = {-1,          31,
+                                    32,          100,
+                                    101,         255,
+                                    256,         65535,
+                                    65536,       2147483647,
+                                    2147483648,  -2147483648,
+                                    4294967295,  4294967296,
+                                    4294967297,  -7,
+                                    -2147483649, std::numeric_limits<int64_t>::max(),
+                                    1000000,     std::numeric_limits<int64_t>::min()};
+constexpr const char* kStrings[] = {"",
+                                    "{",
+                                    "{\"mode\":1,}",
+                                    "sitting",
+                                    "null",
+                                    "[]",
+                                    "[1]",
+                                    "{\"logN\":1}}",
                                     "{\"mode\":1,\"mode\":4,\"classMask\":2,\"classMask\":3}",
                                     "{\"classMask\":99999999999999999999}",
-                                    " {\"classMask\" : 1 }\n", "{\"classMask\":1}%s%n"};
-constexpr const char* kNames[] = {"NumberOne ", "NumberTwo ", "NumberZero ", "LetterA ", "LetterF ",
+                                    " {\"classMask\" : 1 }\n",
+                                    "{\"classMask\":1}%s%n"};
+constexpr const char* kNames[] = {"NumberOne ", "NumberTwo ", "NumberZero ", "LetterA ",  "LetterF ",
                                   "LetterA",    "",           "LetterG ",    "numberone "};
 constexpr uint64_t kTimestamps[] = {0, 1, 2, 3, 4, 5, 0x100000001, 0xFFFFFFFFFFFFFFFF};
 constexpr int kCounts[] = {1, 1, 1, 1, 1, 2, 2, 3, 4, 4, 7, 8, 16, 32, 64, 128, 256, 300, 0, -1};
@@ -344,6 +357,8 @@ uint32_t RandomChoices::below(uint32_t bound) {
   return static_cast<uint32_t>((mixed ^ mixed >> 31) >> 32) % bound;
 }
 
-Sequence makeSequence(Choices& choices) { return Generator(choices).sequence(); }
+Sequence makeSequence(Choices& choices) {
+  return Generator(choices).sequence();
+}
 
 }  // namespace oracle

@@ -36,7 +36,9 @@ Integer at(const uint8_t* data, size_t offset) {
   return value;
 }
 
-bool bit(int32_t mask, int64_t position) { return (static_cast<uint32_t>(mask) >> (position & 31) & 1U) != 0; }
+bool bit(int32_t mask, int64_t position) {
+  return (static_cast<uint32_t>(mask) >> (position & 31) & 1U) != 0;
+}
 
 int32_t shifted(int32_t value, int32_t count) {
   return static_cast<int32_t>(static_cast<uint32_t>(value) << (static_cast<uint32_t>(count) & 31U));
@@ -597,10 +599,10 @@ int Model::deliverGesture(const Session& session, const uint8_t* data, int len) 
 }
 
 void Model::recognise(const uint8_t* data, int len) {
-  constexpr const char* kNames[] = {"NumberOne ",   "NumberTwo ",   "NumberThree ", "NumberFour ",
-                                    "NumberFive ",  "NumberSix ",   "NumberSeven ", "NumberEight ",
-                                    "NumberNine ",  "NumberZero ",  "LetterA ",     "LetterB ",
-                                    "LetterC ",     "LetterD ",     "LetterE ",     "LetterF "};
+  constexpr const char* kNames[] = {"NumberOne ",  "NumberTwo ",  "NumberThree ", "NumberFour ",
+                                    "NumberFive ", "NumberSix ",  "NumberSeven ", "NumberEight ",
+                                    "NumberNine ", "NumberZero ", "LetterA ",     "LetterB ",
+                                    "LetterC ",    "LetterD ",    "LetterE ",     "LetterF "};
   const int prx = at<int16_t>(data, 8);
   const int size = at<uint16_t>(data, 10);
   const int groups = std::max((size + 11) / 12, 1);

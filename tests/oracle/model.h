@@ -43,8 +43,8 @@ struct Outcome {
 // Mistakes that the model makes on purpose, to see that a difference is found and shrunk.
 enum class Mistake { none, noMajorityIsClass0, closedSessionStaysMerged, optionDropsPendingItems };
 
-// Which allocations of a call fail; `rebuild` has a bit for each session of the sensor, in opening order. Room is what is
-// needed before a sensor is started, be it for twelve new sensors or for one session more.
+// Which allocations of a call fail; `rebuild` has a bit for each session of the sensor, in opening order. Room is what
+// is needed before a sensor is started, be it for twelve new sensors or for one session more.
 struct Shortage {
   bool room = false;
   bool session = false;
@@ -62,8 +62,8 @@ class Model {
   explicit Model(Mistake makes = Mistake::none) : mistake(makes) {}
   bool operator==(const Model&) const = default;
 
-  // The calls of the library. The handle of a new session is the library's to choose; it is ignored when the model opens
-  // none.
+  // The calls of the library. The handle of a new session is the library's to choose; it is ignored when the model
+  // opens none.
   Outcome open(const char* name, const void* handle);
   Outcome setOption(const void* handle, const char* text, bool hasOut);
   Outcome dispatch(const void* handle, const uint8_t* data, int len, bool hasOut, bool hasLength);

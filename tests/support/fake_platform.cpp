@@ -57,9 +57,13 @@ int openDevice(const hw_module_t* module, const char* id, hw_device_t** device) 
 
 }  // namespace
 
-const void* Platform::deviceAddress() const { return &aware_device; }
+const void* Platform::deviceAddress() const {
+  return &aware_device;
+}
 
-std::vector<LogLine> Platform::takeLog() { return std::exchange(log, {}); }
+std::vector<LogLine> Platform::takeLog() {
+  return std::exchange(log, {});
+}
 
 Platform& platform() {
   static Platform one;
@@ -113,5 +117,7 @@ char* gesture_process_single_data(const int16_t* group, int count, bool last) {
   return copy;
 }
 
-void gesture_close() { ++fake::platform().gestureCloses; }
+void gesture_close() {
+  ++fake::platform().gestureCloses;
+}
 }

@@ -10,8 +10,8 @@
 #include <vector>
 
 // Fakes of the three platform libraries, for programs that test the library: the functions that it imports from liblog,
-// libhardware and libgesture, which record each call and answer as they are told. They are the test program's own and so
-// stand before those of the real libraries.
+// libhardware and libgesture, which record each call and answer as they are told. They are the test program's own and
+// so stand before those of the real libraries.
 namespace fake {
 
 struct LogLine {
