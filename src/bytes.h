@@ -42,12 +42,19 @@ inline void storeI32(std::span<uint8_t> bytes, size_t offset, int32_t value) {
   store(bytes, offset, value);
 }
 
-// Copies elements of a batch: most often a single one of 16 bits, which takes less than a call of memcpy().
-inline void copyElements(uint8_t* to, const void* from, size_t bytes) {
-  if (bytes == sizeof(uint16_t)) {
-    std::memcpy(to, from, sizeof(uint16_t));
+// Kept apart for the compiler not to see how little it is at most: it would take a string instruction for the copy,
+// which starts far slower than memcpy() does.
+[[gnu::noinline]] inline void copyAnySize(uint8_t* to, const void* from, size_t size) {
+  std::memcpy(to, from, size);
+}
+
+// Copies bytes that most often are `kUsualSize`, which then takes no call.
+template <size_t kUsualSize>
+void copyBytes(uint8_t* to, const void* from, size_t size) {
+  if (size == kUsualSize) {
+    std::memcpy(to, from, kUsualSize);
   } else {
-    std::memcpy(to, from, bytes);
+    copyAnySize(to, from, size);
   }
 }
 

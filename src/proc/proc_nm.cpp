@@ -13,7 +13,8 @@ ProcNM::ProcNM(int elementSize, EqualFunc equal, CheckSeqFunc checkSeq, int buff
 bool ProcNM::gather(const void* data, int count) {
   const int taken = std::min(count, bufferLength() - filled);
   if (taken <= 0) return false;
-  copyElements(buffer() + filled * elemSize, data, static_cast<size_t>(taken * elemSize));
+  const auto size = static_cast<size_t>(elemSize);
+  copyBytes<sizeof(uint16_t)>(buffer() + static_cast<size_t>(filled) * size, data, static_cast<size_t>(taken) * size);
   filled += taken;
   return filled == bufferLength();
 }

@@ -75,8 +75,10 @@ int SessionActivity::postProcess(void* data, int len, void** out, int* outLen) n
   if (!record.empty()) {
     if (record.size() < kHeaderSize) return -1;
     const int items = loadI16(record, kValueOffset);
-    if (items > 0 && record.size() < kHeaderSize + 2 * static_cast<size_t>(items)) return -1;
-    std::memcpy(result.data(), record.data(), std::min(record.size(), result.size()));
+    if (items > 0 && record.size() < kHeaderSize + ActivityRecord::kSize * static_cast<size_t>(items)) return -1;
+    std::memcpy(result.data(), record.data(), kHeaderSize);
+    copyBytes<ActivityRecord::kSize>(result.data() + kHeaderSize, record.data() + kHeaderSize,
+                                     ActivityRecord::kSize * static_cast<size_t>(std::clamp(items, 0, kMostItems)));
   }
   const int count = std::min<int>(loadI16(result, kValueOffset), kMostItems);
   return proc->accept(result.data() + kHeaderSize, count) ? deliver(out, outLen) : 0;
@@ -84,10 +86,10 @@ int SessionActivity::postProcess(void* data, int len, void** out, int* outLen) n
 
 int SessionActivity::deliver(void** out, int* outLen) {
   const auto result = work.bytes();
-  const int delivered = proc->bufferLength();
-  const size_t bytes = static_cast<size_t>(delivered) * ActivityRecord::kSize;
+  const size_t delivered = static_cast<size_t>(proc->bufferLength());
+  const size_t bytes = delivered * ActivityRecord::kSize;
   storeU16(result, kValueOffset, static_cast<uint16_t>(delivered));
-  copyElements(result.data() + kHeaderSize, proc->buffer(), bytes);
+  copyBytes<ActivityRecord::kSize>(result.data() + kHeaderSize, proc->buffer(), bytes);
   proc->reset();
   *out = result.data();
   *outLen = static_cast<int>(kHeaderSize + bytes);

@@ -11,13 +11,10 @@ int SessionPDR::postProcess(void* data, int len, void** out, int* outLen) noexce
   if (record.size() < kHeaderSize) return -1;
   const int count = loadI16(record, kValueOffset);
   if (count < 0 || pendingCount + count > kMostItems) return -1;
-  const auto added = static_cast<size_t>(count * kItemSize);
-  if (record.size() < kHeaderSize + added) return -1;
+  if (record.size() < kHeaderSize + static_cast<size_t>(count * kItemSize)) return -1;
 
   uint8_t* const end = work.bytes().data() + kHeaderSize + pendingCount * kItemSize;
-  for (size_t done = 0; done < added; done += kItemSize) {  // mostly once, for which a copy of a known size is quickest
-    std::memcpy(end + done, record.data() + kHeaderSize + done, kItemSize);
-  }
+  copyBytes<kItemSize>(end, record.data() + kHeaderSize, static_cast<size_t>(count * kItemSize));
   pendingCount += count;
   const int threshold = 1 << static_cast<const OptionPDR&>(*option).N();  // 0 to 6
   return pendingCount < threshold ? 0 : deliver(record, out, outLen);
