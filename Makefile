@@ -1,28 +1,58 @@
 # What people type. CMake does the work: see CMakePresets.json for what is built, and where.
+SHELL := /bin/bash
 
 .DEFAULT_GOAL := demo
-.PHONY: demo test deps deps-test
+.PHONY: demo test bench bench-count fuzz lint
+.SILENT:
+
+# $(call build,PRESET,CMAKE ARGUMENTS): quietly, unless it fails.
+build = { cmake --preset $(1) $(2) && cmake --build --preset $(1); } >build/$(1).log 2>&1 || { cat build/$(1).log; exit 1; }
+
+# $(call install,TASKS)
+install = mkdir -p build && scripts/install-deps.sh $(1)
 
 # Replays a day's commute through three clients of the activity sensor, in the 32-bit build where the host has one.
-demo: deps
-	@set -e; preset=$$(scripts/host-presets.sh x86 native | awk '{ print $$1 }'); \
-	cmake --preset $$preset -DBUILD_TESTING=OFF >build/$$preset.log 2>&1 || { cat build/$$preset.log; exit 1; }; \
-	cmake --build --preset $$preset >build/$$preset.log 2>&1 || { cat build/$$preset.log; exit 1; }; \
+demo:
+	$(call install,build)
+	read -r preset _ <<<"$$(scripts/host-presets.sh x86 native)"; \
+	$(call build,$$preset,-DBUILD_TESTING=OFF); \
 	build/$$preset/bin/senseloom replay examples/commute.jsonl
 
 # Builds and tests everything: both word sizes, optimised and under sanitizers.
-test: deps-test
-	@set -e; for preset in $$(scripts/host-presets.sh x86 native asan-x86 asan-native); do \
+test:
+	$(call install,build test)
+	for preset in $$(scripts/host-presets.sh x86 native asan-x86 asan-native); do \
 	  echo "== $$preset"; \
-	  cmake --preset $$preset -DBUILD_TESTING=ON >build/$$preset.log 2>&1 || { cat build/$$preset.log; exit 1; }; \
-	  cmake --build --preset $$preset >build/$$preset.log 2>&1 || { cat build/$$preset.log; exit 1; }; \
-	  ctest --preset $$preset --progress; \
+	  $(call build,$$preset,-DBUILD_TESTING=ON); \
+	  ctest --preset $$preset || exit 1; \
 	done
 
-deps:
-	@mkdir -p build
-	@scripts/install-deps.sh build
+# Times the library beside what one would write instead, and prints ratios.
+bench:
+	$(call install,build test bench)
+	programs=; for preset in $$(scripts/host-presets.sh x86 native); do \
+	  $(call build,$$preset,-DBUILD_TESTING=ON -DSENSELOOM_BENCH=ON); \
+	  programs="$$programs build/$$preset/bin/bench_contests"; \
+	done; bench/report $$programs
 
-deps-test:
-	@mkdir -p build
-	@scripts/install-deps.sh build test
+# Counts instructions and heap calls a record, beside their bounds.
+bench-count:
+	$(call install,build test)
+	for preset in $$(scripts/host-presets.sh x86 native); do \
+	  $(call build,$$preset,-DBUILD_TESTING=ON); \
+	  bench/count/count build/$$preset/bin/bench_scenarios || exit 1; \
+	done
+
+# Lets each fuzzer run for FUZZ_SECONDS, in both word sizes.
+FUZZ_SECONDS := 60
+fuzz:
+	$(call install,build test fuzz)
+	for preset in $$(scripts/host-presets.sh fuzz-x86 fuzz-native); do \
+	  $(call build,$$preset,-DBUILD_TESTING=ON); \
+	  fuzz/run.sh $(FUZZ_SECONDS) build/$$preset || exit 1; \
+	done
+
+lint:
+	$(call install,build test lint)
+	$(call build,native,-DBUILD_TESTING=ON)
+	scripts/lint.sh build/native

@@ -2,17 +2,23 @@
 # Installs what building, testing or another task needs and the machine lacks, from Debian's packages. Prints nothing
 # when nothing is missing.
 #
-#   scripts/install-deps.sh [TASK...]    tasks: build (the default), test
+#   scripts/install-deps.sh [TASK...]    tasks: build (the default), test, bench, fuzz, lint
 set -euo pipefail
 
 # Per task: packages that are programs or headers, and libraries, which 32-bit x86 needs in its own version, too.
 declare -A programs=(
   [build]="g++ cmake ninja-build libcli11-dev"
-  [test]="abigail-tools binutils clang dpkg-dev file groff-base libc++-dev pkg-config"
+  [test]="abigail-tools binutils clang dpkg-dev file groff-base libc++-dev pkg-config python3 valgrind"
+  [bench]="libboost-dev librange-v3-dev"
+  [fuzz]="clang"
+  [lint]="clang-format clang-tidy codespell cppcheck shellcheck"
 )
 declare -A libraries=(
   [build]="libjansson-dev android-liblog-dev"
-  [test]="libgtest-dev"
+  [test]="libc6-dbg libgtest-dev"
+  [bench]="libbenchmark-dev libsigc++-2.0-dev"
+  [fuzz]="libclang-rt-14-dev"
+  [lint]=""
 )
 
 [ $# -gt 0 ] || set -- build
@@ -22,8 +28,8 @@ for task in "$@"; do
   read -ra more <<<"${programs[$task]}"
   wanted+=("${more[@]}")
   read -ra more <<<"${libraries[$task]}"
-  wanted+=("${more[@]/%/:$host}")
-  if [ "$host" = amd64 ]; then wanted+=(g++-multilib "${more[@]/%/:i386}"); fi
+  if [ ${#more[@]} -gt 0 ]; then wanted+=("${more[@]/%/:$host}"); fi
+  if [ "$host" = amd64 ] && [ ${#more[@]} -gt 0 ]; then wanted+=(g++-multilib "${more[@]/%/:i386}"); fi
 done
 
 installed=$(dpkg-query --show --showformat '${Package} ${Status}\n${Package}:${Architecture} ${Status}\n' |

@@ -9,7 +9,7 @@ namespace senseloom {
 // number in the upper 12.
 class ActivityRecord {
  public:
-  static constexpr size_t kSize = sizeof(uint16_t);
+  static constexpr int kSize = sizeof(uint16_t);
 
   static ActivityRecord at(const void* bytes) {
     ActivityRecord record;

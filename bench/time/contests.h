@@ -1,0 +1,12 @@
+#pragma once
+
+namespace bench {
+
+// Each checks its contenders and registers their measurements.
+void filterContests();
+void fanOutContests();
+void deadReckoningContest();
+void activityContests();
+void optionContests();
+
+}  // namespace bench
