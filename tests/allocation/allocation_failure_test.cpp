@@ -12,7 +12,7 @@
 #include "client.h"
 #include "generator.h"
 #include "held_lists.h"
-#include "memory.h"
+#include "library_memory.h"
 #include "model.h"
 
 // Every call of a scenario is made with its first, its second, ... allocation failing, until it succeeds: with that one

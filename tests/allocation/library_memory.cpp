@@ -1,16 +1,12 @@
-#include "memory.h"
+#include "library_memory.h"
 
-#include <hardware/hardware.h>
 #include <jansson.h>
 #include <senseloom.h>
 
-#include <cstdarg>
 #include <cstdint>
-#include <cstdio>
 #include <cstdlib>
 #include <functional>
 #include <new>
-#include <string>
 #include <unordered_map>
 #include <utility>
 
@@ -47,7 +43,7 @@ Blocks& liveBlocks() {
 size_t live_bytes = 0;
 
 int calls = 0;   // of the library that are under way
-int exempt = 0;  // calls of the platform that are under way within
+int exempt = 0;  // objects of Exempt
 
 size_t until_failure = 0;  // allocations left, the one that fails included; 0: none fails
 bool fails_for_ever = false;
@@ -84,16 +80,12 @@ void* newBlock(size_t size) {
   return block;
 }
 
-// While one lives, a counter is one higher.
-class Raised {
+class Watch {
  public:
-  explicit Raised(int& which) : counter(which) { ++counter; }
-  ~Raised() { --counter; }
-  Raised(const Raised&) = delete;
-  Raised& operator=(const Raised&) = delete;
-
- private:
-  int& counter;
+  Watch() { ++calls; }
+  ~Watch() { --calls; }
+  Watch(const Watch&) = delete;
+  Watch& operator=(const Watch&) = delete;
 };
 
 }  // namespace
@@ -109,6 +101,13 @@ void failAt(size_t which, bool forEver) {
 bool stopFailing() {
   until_failure = 0;
   return has_failed;
+}
+
+Exempt::Exempt() {
+  ++exempt;
+}
+Exempt::~Exempt() {
+  --exempt;
 }
 
 size_t blocks() {
@@ -172,59 +171,9 @@ void __wrap_free(void* block) {
 #define WATCHED(Result, function, parameters, arguments) \
   Result __real_##function parameters noexcept;          \
   Result __wrap_##function parameters noexcept {         \
-    const Raised call(calls);                            \
+    const Watch watch;                                   \
     return __real_##function arguments;                  \
   }
-
-// --- the calls of the platform, which are made within
-
-#define EXEMPT(Result, function, parameters, arguments) \
-  Result __real_##function parameters;                  \
-  Result __wrap_##function parameters {                 \
-    const Raised call(exempt);                          \
-    return __real_##function arguments;                 \
-  }
-
-namespace {
-
-// The device's operations are called through pointers; these stand before them.
-struct Device {
-  hw_device_t common;
-  int (*activate)(Device*, const void*);
-  int (*deactivate)(Device*);
-};
-const hw_module_t* real_module = nullptr;
-Device real_device;
-
-int openExempt(const hw_module_t*, const char* id, hw_device_t** device) {
-  const Raised call(exempt);
-  const int result = real_module->methods->open(real_module, id, device);
-  if (result != 0 || *device == nullptr) return result;
-  auto* opened = reinterpret_cast<Device*>(*device);
-  real_device = *opened;
-  opened->activate = [](Device* self, const void* block) {
-    const Raised within(exempt);
-    return real_device.activate(self, block);
-  };
-  opened->deactivate = [](Device* self) {
-    const Raised within(exempt);
-    return real_device.deactivate(self);
-  };
-  opened->common.close = [](hw_device_t* self) {
-    const Raised within(exempt);
-    return real_device.common.close(self);
-  };
-  return result;
-}
-
-hw_module_methods_t exempt_methods = {openExempt};
-const hw_module_t exempt_module = [] {
-  hw_module_t module{};
-  module.methods = &exempt_methods;
-  return module;
-}();
-
-}  // namespace
 
 extern "C" {
 
@@ -243,31 +192,5 @@ WATCHED(void*, _va_init, (varray_t * va, int elemSize), (va, elemSize))
 WATCHED(void*, va_new, (varray_t * va), (va))
 WATCHED(void*, _va_del, (varray_t * va, int index, void* out), (va, index, out))
 WATCHED(void, va_free, (varray_t * va), (va))
-
-EXEMPT(int, puts, (const char* text), (text))
-EXEMPT(bool, gesture_initial, (int first, int second), (first, second))
-EXEMPT(char*, gesture_process_single_data, (const int16_t* group, int count, bool last), (group, count, last))
-EXEMPT(void, gesture_close, (void), ())
-int __real_hw_get_module_by_class(const char* classId, const char* inst, const hw_module_t** module);
-int __wrap_hw_get_module_by_class(const char* classId, const char* inst, const hw_module_t** module) {
-  const Raised call(exempt);
-  const int result = __real_hw_get_module_by_class(classId, inst, &real_module);
-  if (result == 0) *module = &exempt_module;
-  return result;
-}
-
-int __real___android_log_print(int priority, const char* tag, const char* format, ...);
-int __wrap___android_log_print(int priority, const char* tag, const char* format, ...) {
-  const Raised call(exempt);
-  va_list arguments;
-  va_start(arguments, format);
-  va_list again;
-  va_copy(again, arguments);
-  std::string text(static_cast<size_t>(std::vsnprintf(nullptr, 0, format, arguments)), '\0');
-  va_end(arguments);
-  std::vsnprintf(text.data(), text.size() + 1, format, again);
-  va_end(again);
-  return __real___android_log_print(priority, tag, "%s", text.c_str());
-}
 
 }  // extern "C"

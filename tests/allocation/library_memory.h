@@ -3,13 +3,23 @@
 #include <cstddef>
 
 // The memory of the library while it works on a call: what it has from malloc(), calloc(), realloc() and operator new,
-// by itself or through the JSON parser. What the platform and the test allocate is not watched and never fails.
+// by itself or through the JSON parser. What others allocate is not watched and never fails. For programs of
+// senseloom_watch_memory().
 namespace memory {
 
 // Lets the allocation `which` of those to come fail, from 1; with `forEver` all later ones, too.
 void failAt(size_t which, bool forEver);
 // Lets no more fail. Returns whether any did.
 bool stopFailing();
+
+// While one lives, allocations are none of the library: it has called the platform.
+class Exempt {
+ public:
+  Exempt();
+  ~Exempt();
+  Exempt(const Exempt&) = delete;
+  Exempt& operator=(const Exempt&) = delete;
+};
 
 // Blocks that the library has allocated and that were not freed yet, and their bytes.
 size_t blocks();

@@ -1,0 +1,44 @@
+#pragma once
+
+#include <comparison.h>
+
+#include <cstddef>
+#include <cstdint>
+#include <cstdio>
+#include <cstdlib>
+
+// What every fuzz target does with an input: it becomes a sequence of calls, and the library has to do in them what the
+// model says. The fuzzer knows the entry point by its name.
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size);
+
+namespace fuzz {
+
+inline oracle::Call openCall(int session, int sensor) {
+  oracle::Call call;
+  call.what = oracle::Call::open;
+  call.session = session;
+  call.sensor = sensor;
+  return call;
+}
+
+inline oracle::Call optionCall(int session, std::string text) {
+  oracle::Call call;
+  call.what = oracle::Call::setOption;
+  call.session = session;
+  call.option.verbatim = std::move(text);
+  return call;
+}
+
+// The sensor that a byte stands for: a letter, so that people can write inputs, too.
+inline int sensorOf(uint8_t letter) {
+  return static_cast<uint8_t>(letter - 'a') % oracle::kSensors;
+}
+
+inline void check(const oracle::Sequence& sequence) {
+  const auto found = oracle::compare(sequence);
+  if (!found) return;
+  std::fprintf(stderr, "call %zu: %s\n%s", found->call + 1, found->text.c_str(), oracle::toTrace(sequence).c_str());
+  std::abort();
+}
+
+}  // namespace fuzz
