@@ -3,7 +3,6 @@
 #include <utility>
 
 #include "hex.h"
-#include "json.h"
 #include "option_data.h"
 
 namespace senseloom::tool {
@@ -11,11 +10,6 @@ namespace {
 
 Json text(const std::string& value) {
   return Json(json_string(value.c_str()));
-}
-
-Json returned(const CallOutcome& outcome) {
-  if (outcome.call.kind != CallKind::open) return Json(json_integer(outcome.returned));
-  return outcome.failed ? Json(json_null()) : text("handle");
 }
 
 Json properties(const CallOutcome& outcome) {
@@ -37,6 +31,11 @@ Json properties(const CallOutcome& outcome) {
 
 }  // namespace
 
+Json returnedJson(const CallOutcome& outcome) {
+  if (outcome.call.kind != CallKind::open) return Json(json_integer(outcome.returned));
+  return outcome.failed ? Json(json_null()) : text("handle");
+}
+
 void JsonOutput::onOutcome(const CallOutcome& outcome) {
   const CallKind kind = outcome.call.kind;
   Json object(json_object());
@@ -46,7 +45,7 @@ void JsonOutput::onOutcome(const CallOutcome& outcome) {
   if (kind != CallKind::uninit) {
     addMember(object, "session", text(outcome.session));
     addMember(object, "sensor", text(outcome.sensor->sensor));
-    addMember(object, "return", returned(outcome));
+    addMember(object, "return", returnedJson(outcome));
   }
   if (kind == CallKind::setOption || kind == CallKind::close) {
     addMember(object, "properties", properties(outcome));

@@ -2,9 +2,13 @@
 
 #include <cstdio>
 
+#include "json.h"
 #include "replayer.h"
 
 namespace senseloom::tool {
+
+// What the library returned: a number; for an open "handle" or null.
+Json returnedJson(const CallOutcome& outcome);
 
 // Prints one JSON object a call and session. What it holds depends on the call alone, not on what came of it:
 //

@@ -25,4 +25,32 @@ const char* propertyName(std::string_view sensor, int32_t id) {
   return found == kind->properties.end() ? "?" : found->name;
 }
 
+std::string rangeText(const Range& range) {
+  if (range.low > range.high) return "none";
+  const bool isOpenBelow = range.low == kAnyValue.low;
+  const bool isOpenAbove = range.high == kAnyValue.high;
+  if (isOpenBelow && isOpenAbove) return "any";
+  return (isOpenBelow ? "" : std::to_string(range.low)) + ".." + (isOpenAbove ? "" : std::to_string(range.high));
+}
+
+const char* mergeText(Merge merge) {
+  switch (merge) {
+    case Merge::bitOr:
+      return "bitwise or";
+    case Merge::minimum:
+      return "minimum";
+    case Merge::maximum:
+      return "maximum";
+    case Merge::allOne:
+      return "1 when all are 1";
+    case Merge::anySet:
+      return "1 when any is not 0";
+    case Merge::keepFirst:
+      return "the one that started the merge";
+    case Merge::takeLast:
+      return "the last one opened";
+  }
+  return "";
+}
+
 }  // namespace senseloom::tool

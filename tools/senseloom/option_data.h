@@ -2,6 +2,7 @@
 
 #include <cstdint>
 #include <span>
+#include <string>
 #include <string_view>
 
 #include "option/option_description.h"
@@ -17,5 +18,9 @@ const OptionDescription* findOptionDescription(std::string_view sensor);
 
 // The name of a sensor's property; "?" when the sensor has no property of that id.
 const char* propertyName(std::string_view sensor, int32_t id);
+
+// For people: "any", "none", or the bounds.
+std::string rangeText(const Range& range);
+const char* mergeText(Merge merge);
 
 }  // namespace senseloom::tool

@@ -119,6 +119,7 @@ void Replayer::dispatch(const TraceCall& call, const Session& session, std::span
   CallOutcome outcome{
       .call = call, .session = session.name, .sensor = session.sensor, .failed = returned < 0, .returned = returned};
   if (returned == 1) outcome.result.emplace(static_cast<const uint8_t*>(result), static_cast<size_t>(length));
+  outcome.record = record;
   observer.onOutcome(outcome);
 }
 

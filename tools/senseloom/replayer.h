@@ -32,6 +32,7 @@ struct CallOutcome {
   int returned = 0;                                       // 0 for open and uninit, which return no int
   std::optional<PropertyList> properties = std::nullopt;  // the list that the library handed out, if it did
   std::optional<std::span<const uint8_t>> result = std::nullopt;  // of a dispatch that returned 1
+  std::span<const uint8_t> record = {};                           // of a dispatch
 };
 
 class ReplayObserver {
@@ -58,6 +59,9 @@ class Replayer {
   // the position in the trace, at the first line that is no call or does not suit the calls before it.
   void replay(TraceReader& trace);
 
+  // Makes one call. Throws InputError when it does not suit the calls before it.
+  void perform(const TraceCall& call);
+
  private:
   struct Session {
     std::string name;
@@ -66,7 +70,6 @@ class Replayer {
   };
   using SessionIterator = std::vector<Session>::iterator;
 
-  void perform(const TraceCall& call);
   void open(const TraceCall& call);
   void setOption(const TraceCall& call, const Session& session);
   void dispatch(const TraceCall& call, const Session& session, std::span<uint8_t> record);

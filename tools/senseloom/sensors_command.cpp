@@ -1,14 +1,12 @@
 #include "sensors_command.h"
 
-#include <algorithm>
-#include <array>
-#include <cstddef>
 #include <utility>
 #include <vector>
 
 #include "input_error.h"
 #include "json.h"
 #include "option_data.h"
+#include "text_table.h"
 
 namespace senseloom::tool {
 namespace {
@@ -20,14 +18,6 @@ std::vector<const OptionDescription*> select(const std::string& sensor) {
     throw InputError("unknown sensor \"" + sensor + "\": `senseloom sensors` prints those that are known");
   }
   return {kind};
-}
-
-std::string rangeText(const Range& range) {
-  if (range.low > range.high) return "none";
-  const bool isOpenBelow = range.low == kAnyValue.low;
-  const bool isOpenAbove = range.high == kAnyValue.high;
-  if (isOpenBelow && isOpenAbove) return "any";
-  return (isOpenBelow ? "" : std::to_string(range.low)) + ".." + (isOpenAbove ? "" : std::to_string(range.high));
 }
 
 std::string outOfRangeText(const OptionKey& key) {
@@ -43,56 +33,20 @@ std::string outOfRangeText(const OptionKey& key) {
   return "";
 }
 
-const char* mergeText(Merge merge) {
-  switch (merge) {
-    case Merge::bitOr:
-      return "bitwise or";
-    case Merge::minimum:
-      return "minimum";
-    case Merge::maximum:
-      return "maximum";
-    case Merge::allOne:
-      return "1 when all are 1";
-    case Merge::anySet:
-      return "1 when any is not 0";
-    case Merge::keepFirst:
-      return "the one that started the merge";
-    case Merge::takeLast:
-      return "the last one opened";
-  }
-  return "";
-}
-
 const char* orEmpty(const char* text) {
   return text == nullptr ? "" : text;
-}
-
-constexpr size_t kColumns = 6;
-using Row = std::array<std::string, kColumns>;
-
-void printRows(std::FILE* out, const std::vector<Row>& rows) {
-  std::array<size_t, kColumns> widths{};
-  for (const Row& row : rows) {
-    for (size_t i = 0; i < kColumns; ++i) widths[i] = std::max(widths[i], row[i].size());
-  }
-  for (const Row& row : rows) {
-    std::string line;
-    for (size_t i = 0; i < kColumns; ++i) line += "  " + row[i] + std::string(widths[i] - row[i].size(), ' ');
-    line.erase(line.find_last_not_of(' ') + 1);
-    std::fprintf(out, "%s\n", line.c_str());
-  }
 }
 
 void printSensor(std::FILE* out, const OptionDescription& kind) {
   std::fprintf(out, "%s: %s\n", kind.sensor, kind.title);
 
-  std::vector<Row> rows{{"key", "default", "range", "out of range", "merged to", "note"}};
+  std::vector<TextRow> rows{{"key", "default", "range", "out of range", "merged to", "note"}};
   for (const OptionKey& key : kind.keys) {
     rows.push_back({key.name, std::to_string(key.defaultValue), rangeText(key.range), outOfRangeText(key),
                     mergeText(key.merge), orEmpty(key.note)});
   }
   for (const char* key : kind.stringKeys) rows.push_back({key, "", "string", "", "", ""});
-  printRows(out, rows);
+  printTable(out, rows);
 
   std::string properties;
   for (const OptionProperty& property : kind.properties) {

@@ -1,5 +1,7 @@
 #include "trace_reader.h"
 
+#include <sys/stat.h>
+
 #include <algorithm>
 #include <cerrno>
 #include <cstdlib>
@@ -7,6 +9,7 @@
 #include <string_view>
 #include <utility>
 
+#include "hex.h"
 #include "input_error.h"
 
 namespace senseloom::tool {
@@ -58,8 +61,14 @@ const RecordLayout* sensorMember(const Json& object) {
   return sensor;
 }
 
-// An option given as a string reaches the library as it stands, be it JSON or not.
+// An option given as a string reaches the library as it stands, be it JSON or not; one that no string can hold is given
+// as bytes.
 std::optional<std::string> optionMember(const Json& object) {
+  if (json_object_get(object.get(), "optionHex") != nullptr) {
+    const auto bytes = fromHex(stringMember(object, "optionHex"));
+    if (!bytes) throw InputError("\"optionHex\" must hold hexadecimal digits, two a byte");
+    return std::string(bytes->begin(), bytes->end());
+  }
   const json_t* option = member(object, "option");
   if (json_is_null(option)) return std::nullopt;
   if (json_is_string(option)) return json_string_value(option);
@@ -71,6 +80,19 @@ Json recordMember(const Json& object) {
   const json_t* record = member(object, "record");
   if (!json_is_object(record)) throw InputError("\"record\" must be an object");
   return Json(json_incref(const_cast<json_t*>(record)));
+}
+
+Json recordedMembers(const Json& object) {
+  if (json_object_get(object.get(), "returned") == nullptr) return nullptr;
+  Json recorded(json_object());
+  for (const char* key : {"returned", "properties", "result"}) {
+    if (json_t* value = json_object_get(object.get(), key)) addMember(recorded, key, Json(json_incref(value)));
+  }
+  return recorded;
+}
+
+bool isNote(const Json& object) {
+  return json_object_get(object.get(), "call") == nullptr && json_object_get(object.get(), "note") != nullptr;
 }
 
 }  // namespace
@@ -94,18 +116,16 @@ TraceReader::TraceReader(const std::string& file)
 }
 
 std::optional<TraceCall> TraceReader::next() {
+  Json object;
   do {
-    if (!readLine()) return std::nullopt;
-  } while (std::string_view(buffer.get(), lineLength).find_first_not_of(" \t\r\n") == std::string_view::npos);
-
-  json_error_t error;
-  const Json object(json_loadb(buffer.get(), lineLength, JSON_REJECT_DUPLICATES, &error));
-  if (object == nullptr) throw InputError(std::string("not JSON: ") + error.text);
-  if (!json_is_object(object.get())) throw InputError("not a JSON object");
+    object = nextObject();
+    if (object == nullptr) return std::nullopt;
+  } while (isNote(object));
 
   TraceCall call;
   call.line = lineNumber;
   call.kind = callMember(object);
+  call.recorded = recordedMembers(object);
   switch (call.kind) {
     case CallKind::open:
       call.session = sessionMember(object);
@@ -140,6 +160,25 @@ std::string TraceReader::position() const {
   return lineNumber == 0 ? name : name + ':' + std::to_string(lineNumber);
 }
 
+uint64_t TraceReader::size() const {
+  struct stat file {};
+  if (fstat(fileno(stream.get()), &file) != 0 || !S_ISREG(file.st_mode)) return 0;
+  return static_cast<uint64_t>(file.st_size);
+}
+
+// The object on the next line that is not blank; null at the end.
+Json TraceReader::nextObject() {
+  do {
+    if (!readLine()) return nullptr;
+  } while (std::string_view(buffer.get(), lineLength).find_first_not_of(" \t\r\n") == std::string_view::npos);
+
+  json_error_t error;
+  Json object(json_loadb(buffer.get(), lineLength, JSON_REJECT_DUPLICATES, &error));
+  if (object == nullptr) throw InputError(std::string("not JSON: ") + error.text);
+  if (!json_is_object(object.get())) throw InputError("not a JSON object");
+  return object;
+}
+
 bool TraceReader::readLine() {
   char* line = buffer.release();
   errno = 0;
@@ -151,6 +190,7 @@ bool TraceReader::readLine() {
   }
   lineLength = static_cast<size_t>(length);
   ++lineNumber;
+  byteCount += lineLength;
   return true;
 }
 

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <cstdio>
 #include <memory>
 #include <optional>
@@ -24,10 +25,11 @@ struct TraceCall {
   const RecordLayout* sensor = nullptr;  // of an open, and of a dispatch to a whole sensor
   std::optional<std::string> option;     // of a set_option; nothing: a null pointer
   Json record;                           // of a dispatch
+  Json recorded;                         // what a recording says it came to; null: nothing
 };
 
-// Reads a trace, JSON Lines with one call a line, a line at a time. Blank lines are skipped; members of a line beyond
-// those of its call are ignored, which leaves room for notes.
+// Reads a trace, JSON Lines with one call a line, a line at a time. Blank lines and lines with a "note" in place of a
+// call are skipped; members of a line beyond those of its call are ignored, which leaves room for notes there, too.
 class TraceReader {
  public:
   // "-" is standard input. Throws InputError when the file can not be opened.
@@ -39,6 +41,10 @@ class TraceReader {
   // Where the last line was read, for messages: "FILE:LINE", or the file alone before the first one.
   std::string position() const;
 
+  uint64_t bytesRead() const { return byteCount; }
+  // Bytes of the whole trace; 0 when it is not a file.
+  uint64_t size() const;
+
  private:
   struct Close {
     void operator()(std::FILE* file) const;
@@ -47,6 +53,7 @@ class TraceReader {
     void operator()(char* text) const;
   };
 
+  Json nextObject();
   bool readLine();
 
   std::string name;
@@ -55,6 +62,7 @@ class TraceReader {
   size_t bufferSize = 0;
   size_t lineLength = 0;
   size_t lineNumber = 0;
+  uint64_t byteCount = 0;
 };
 
 }  // namespace senseloom::tool

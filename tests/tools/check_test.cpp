@@ -1,0 +1,141 @@
+#include <gtest/gtest.h>
+#include <unistd.h>
+
+#include <fstream>
+#include <string>
+
+#include "recording.h"
+
+namespace senseloom::tool {
+namespace {
+
+constexpr char kRecording[] = R"({"call":"open","session":"s1","sensor":"STAP","returned":"handle"}
+{"call":"set_option","session":"s1","option":"{\"classMask\":2}","returned":0,"properties":[{"id":101,"size":4,"value":"02000000"},{"id":102,"size":4,"value":"00000000"}]}
+{"note":"a line of its own"}
+{"call":"dispatch","session":"s1","record":{"hex":"01000000000000000200"},"returned":1,"result":{"hex":"01000000000000000200"}}
+{"call":"dispatch","session":"s1","record":{"hex":"02000000000000000100"},"returned":0}
+{"call":"set_option","session":"s1","option":"{","returned":-1}
+{"call":"close","session":"s1","returned":0}
+)";
+
+ToolRun checkText(const std::string& trace) {
+  return runTool({"replay", "--check", "-"}, trace);
+}
+
+// Checks the recording with a piece of it replaced, and expects one difference.
+void expectDifference(const std::string& piece, const std::string& replacement, const std::string& difference) {
+  std::string tampered = kRecording;
+  tampered.replace(tampered.find(piece), piece.size(), replacement);
+  const ToolRun run = checkText(tampered);
+  EXPECT_EQ(run.out, "standard input:" + difference);
+  EXPECT_EQ(run.err, "senseloom: 1 of 6 calls compared differ\n");
+  EXPECT_EQ(run.status, 1);
+}
+
+TEST(ReplayCheck, AgreesWithARecording) {
+  const ToolRun run = checkText(kRecording);
+  EXPECT_EQ(run.out, "6 calls compared, all as recorded\n");
+  EXPECT_EQ(run.err, "");
+  EXPECT_EQ(run.status, 0);
+}
+
+TEST(ReplayCheck, TellsAnotherReturnValue) {
+  expectDifference(R"("returned":-1)", R"("returned":0)",
+                   "6: set_option of session \"s1\" differs from the recording\n"
+                   "  expected: {\"returned\":0}\n"
+                   "  actual:   {\"returned\":-1}\n");
+  expectDifference(R"("returned":"handle")", R"("returned":null)",
+                   "1: open of session \"s1\" differs from the recording\n"
+                   "  expected: {\"returned\":null}\n"
+                   "  actual:   {\"returned\":\"handle\"}\n");
+}
+
+TEST(ReplayCheck, TellsAnotherProperty) {
+  expectDifference(
+      R"("value":"02000000")", R"("value":"03000000")",
+      "2: set_option of session \"s1\" differs from the recording\n"
+      R"(  expected: {"returned":0,"properties":[{"id":101,"size":4,"value":"03000000"},{"id":102,"size":4,"value":"00000000"}]})"
+      "\n"
+      R"(  actual:   {"returned":0,"properties":[{"id":101,"size":4,"value":"02000000"},{"id":102,"size":4,"value":"00000000"}]})"
+      "\n");
+}
+
+TEST(ReplayCheck, TellsALessOrAMore) {
+  expectDifference(R"("returned":0})", R"("returned":0,"properties":[]})",
+                   "5: dispatch of session \"s1\" differs from the recording\n"
+                   "  expected: {\"returned\":0,\"properties\":[]}\n"
+                   "  actual:   {\"returned\":0}\n");
+  expectDifference(R"(,"result":{"hex":"01000000000000000200"})", "",
+                   "4: dispatch of session \"s1\" differs from the recording\n"
+                   "  expected: {\"returned\":1}\n"
+                   R"(  actual:   {"returned":1,"result":{"hex":"01000000000000000200"}})"
+                   "\n");
+}
+
+TEST(ReplayCheck, TellsAnotherResult) {
+  expectDifference(R"("result":{"hex":"01)", R"("result":{"hex":"03)",
+                   "4: dispatch of session \"s1\" differs from the recording\n"
+                   R"(  expected: {"returned":1,"result":{"hex":"03000000000000000200"}})"
+                   "\n"
+                   R"(  actual:   {"returned":1,"result":{"hex":"01000000000000000200"}})"
+                   "\n");
+}
+
+TEST(ReplayCheck, TellsEveryDifference) {
+  const ScratchFile trace("differences");
+  std::ofstream(trace.name) << R"({"call":"open","session":"a","sensor":"LIFT","returned":null}
+{"call":"open","session":"b","sensor":"LIFT"}
+{"call":"dispatch","sensor":"LIFT","record":{"hex":""},"returned":0}
+)";
+  const ToolRun run = check(trace.name);
+  const std::string rest =
+      " differs from the recording\n  expected: {\"returned\":0}\n"
+      "  actual:   {\"returned\":1,\"result\":{\"hex\":\"\"}}\n";
+  EXPECT_EQ(run.out, trace.name +
+                         ":1: open of session \"a\" differs from the recording\n"
+                         "  expected: {\"returned\":null}\n  actual:   {\"returned\":\"handle\"}\n" +
+                         trace.name + ":3: dispatch of session \"a\"" + rest + trace.name +
+                         ":3: dispatch of session \"b\"" + rest);
+  EXPECT_EQ(run.err, "senseloom: 3 of 3 calls compared differ\n");
+  EXPECT_EQ(run.status, 1);
+}
+
+TEST(ReplayCheck, CountsCallsWithoutARecordedResult) {
+  const ToolRun run = runTool({"replay", "--check", "tapping.jsonl"});
+  EXPECT_EQ(run.out, "0 calls compared, all as recorded; 20 without a recorded result\n");
+  EXPECT_EQ(run.status, 0);
+}
+
+TEST(ReplayCheck, StopsAtALineThatIsNoCall) {
+  const ToolRun run = checkText(std::string(kRecording) + "stop\n");
+  EXPECT_EQ(run.out, "");
+  EXPECT_EQ(run.err.rfind("senseloom: standard input:8: not JSON: ", 0), 0U) << run.err;
+  EXPECT_EQ(run.status, 2);
+}
+
+TEST(ReplayCheck, TakesNoMoreMemoryForALongRecordingThanForAShortOne) {
+#ifdef SANITIZED
+  GTEST_SKIP() << "the sanitizer itself holds on to freed memory";
+#endif
+  const auto recordAndCheck = [](int records) {
+    const ScratchFile trace("long_trace");
+    const ScratchFile recording("long_recording");
+    {
+      std::ofstream stream(trace.name);
+      stream << R"({"call":"open","session":"a","sensor":"PHYAC"})" << '\n';
+      for (int i = 0; i < records; ++i) {
+        stream << R"({"call":"dispatch","session":"a","record":{"hex":"510000000000000001005300"}})" << '\n';
+      }
+    }
+    const ToolRun recorded = recordTo(recording.name, {TOOL_FILE, "replay", "--quiet", trace.name});
+    const ToolRun checked = check(recording.name);
+    EXPECT_EQ(recorded.status, 0);
+    EXPECT_EQ(checked.out, std::to_string(records + 2) + " calls compared, all as recorded\n");
+    return std::max(recorded.peakKilobytes, checked.peakKilobytes);
+  };
+  const long shortPeak = recordAndCheck(1000);
+  EXPECT_LT(recordAndCheck(100000), shortPeak + 1024);
+}
+
+}  // namespace
+}  // namespace senseloom::tool

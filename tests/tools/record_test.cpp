@@ -1,0 +1,92 @@
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <fstream>
+#include <string>
+
+#include "recording.h"
+
+namespace senseloom::tool {
+namespace {
+
+class RecordedExample : public testing::TestWithParam<const char*> {};
+
+TEST_P(RecordedExample, IsReplayedAsRecorded) {
+  const ScratchFile trace(GetParam());
+  const std::string example = std::string(GetParam()) + ".jsonl";
+  const ToolRun recorded = recordTo(trace.name, {TOOL_FILE, "replay", "--log", "none", "--all", example});
+  EXPECT_EQ(recorded.status, 0) << recorded.err;
+  // The recording changes nothing of what the program prints.
+  const ToolRun plain = runTool({"replay", "--all", example}, "", {{"SENSELOOM_GESTURE_SCRIPT", "gesture_hmm.script"}});
+  EXPECT_EQ(recorded.out, plain.out);
+
+  const std::string content = contentOf(trace.name);
+  const auto calls = std::count(content.begin(), content.end(), '\n');
+  const ToolRun checked = check(trace.name);
+  EXPECT_EQ(checked.out, std::to_string(calls) + " calls compared, all as recorded\n");
+  EXPECT_EQ(checked.status, 0);
+}
+
+INSTANTIATE_TEST_SUITE_P(EverySensor, RecordedExample,
+                         testing::Values("commute", "tapping", "gesture_flick", "shaking", "instant_activity",
+                                         "step_count", "gesture_hmm", "dtwgs", "gesture_eartouch",
+                                         "audio_classification", "pdr", "lift"),
+                         [](const auto& example) { return std::string(example.param); });
+
+TEST(Record, RecordsAProgramThatUsesTheLibrary) {
+  const ScratchFile trace("embed");
+  const ToolRun recorded = recordTo(trace.name, {EMBED_FILE});
+  EXPECT_EQ(recorded.status, 0);
+  EXPECT_EQ(recorded.out.rfind("  property 41 = 0\n", 0), 0U) << recorded.out;
+  // 2 opened, 2 options, 8 records, 2 closed; ctx_uninit() returns nothing.
+  EXPECT_EQ(check(trace.name).out, "14 calls compared, all as recorded; 1 without a recorded result\n");
+}
+
+TEST(Record, PassesTheExitStatusAndTheArgumentsOn) {
+  const ScratchFile trace("arguments");
+  const ToolRun run = recordTo(trace.name, {TOOL_FILE, "replay", "--json", "--", "-"}, "stop\n");
+  EXPECT_EQ(run.err.rfind("senseloom: standard input:1: not JSON: ", 0), 0U) << run.err;
+  EXPECT_EQ(run.status, 2);
+}
+
+TEST(Record, PassesASignalOn) {
+#ifdef SANITIZED
+  GTEST_SKIP() << "a shell does not have the sanitizer that the preloaded library needs";
+#endif
+  const ScratchFile trace("signal");
+  EXPECT_EQ(recordTo(trace.name, {"sh", "-c", "kill -9 $$"}).status, -1);
+}
+
+TEST(Record, KeepsWhatIsPreloadedInFront) {
+#ifdef SANITIZED
+  GTEST_SKIP() << "a shell does not have the sanitizer that the preloaded library needs";
+#endif
+  const ScratchFile trace("preload");
+  const ToolRun run = recordTo(trace.name, {"sh", "-c", "echo \"$LD_PRELOAD\""}, "", {{"LD_PRELOAD", "libdl.so.2"}});
+  EXPECT_EQ(run.out, "libdl.so.2:" TRACE_LIBRARY "\n");
+}
+
+TEST(Record, LeavesAnEmptyTraceOfAProgramThatDoesNotUseTheLibrary) {
+  const ScratchFile trace("none");
+  std::ofstream(trace.name) << "of an earlier run\n";
+  EXPECT_EQ(recordTo(trace.name, {TOOL_FILE, "--version"}).status, 0);
+  EXPECT_EQ(contentOf(trace.name), "");
+}
+
+TEST(Record, RefusesAProgramThatCanNotBeStarted) {
+  const ScratchFile trace("missing");
+  const ToolRun run = recordTo(trace.name, {"/no/such/program"});
+  EXPECT_EQ(run.err, "senseloom: /no/such/program: No such file or directory\n");
+  EXPECT_EQ(run.status, 2);
+  EXPECT_EQ(runTool({"record", "-o", trace.name}).status, 2);
+}
+
+TEST(Record, RefusesAFileThatCanNotBeWritten) {
+  const ToolRun run = recordTo("/no/such/folder/trace", {TOOL_FILE, "--version"});
+  EXPECT_EQ(run.err, "senseloom: /no/such/folder/trace: No such file or directory\n");
+  EXPECT_EQ(run.out, "");
+  EXPECT_EQ(run.status, 2);
+}
+
+}  // namespace
+}  // namespace senseloom::tool

@@ -1,0 +1,38 @@
+# Completion of senseloom's command line for bash.
+# shellcheck shell=bash
+
+_senseloom() {
+  local sensors="PHYAC STAP GSFLK SHAKI ISACT SCOUN GSPX DTWGS GSETH LPE_P PDR LIFT"
+  # Options of each command, and what else may follow it. Where nothing of that fits, a file may.
+  local -A options=(
+    [senseloom]="--help --version"
+    [replay]="--help --json --quiet --all --check --log --plot --class-names"
+    [explain]="--help --records --plot --class-names"
+    [record]="--help --output"
+    [generate]="--help"
+    [generate commute]="--help --seed --records"
+    [sensors]="--help --json"
+  )
+  local -A words=(
+    [senseloom]="replay explain record generate sensors"
+    [explain]=$sensors
+    [generate]="commute"
+    [sensors]=$sensors
+  )
+  local current=${COMP_WORDS[COMP_CWORD]} command="" candidates longer word
+  for word in "${COMP_WORDS[@]:1:COMP_CWORD-1}"; do
+    longer=${command:+$command }$word
+    if [[ $word && ${options[$longer]-} ]]; then command=$longer; fi
+  done
+  : "${command:=senseloom}"
+
+  case ${COMP_WORDS[COMP_CWORD - 1]} in
+    --log) candidates="debug info warn error none" ;;
+    --output | -o | --plot) return ;; # a file
+    --seed | --class-names) return ;; # whatever one likes
+    --) candidates=$(compgen -c) ;;
+    *) if [[ $current == -* ]]; then candidates=${options[$command]}; else candidates=${words[$command]-}; fi ;;
+  esac
+  mapfile -t COMPREPLY < <(compgen -W "$candidates" -- "$current")
+}
+complete -o default -F _senseloom senseloom

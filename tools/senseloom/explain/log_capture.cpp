@@ -1,0 +1,35 @@
+#include "explain/log_capture.h"
+
+#include <android/log.h>
+
+#include <utility>
+
+namespace senseloom::tool {
+namespace {
+
+// The logger is a plain function and knows of no object.
+std::vector<LogLine> lines;
+
+void keep(const __android_logger_data* data, const char* message) {
+  std::string text = message;
+  while (!text.empty() && text.back() == '\n') text.pop_back();
+  lines.push_back({data->priority, data->tag == nullptr ? "" : data->tag, std::move(text)});
+}
+
+}  // namespace
+
+LogCapture::LogCapture() : priorityBefore(__android_log_set_minimum_priority(ANDROID_LOG_DEBUG)) {
+  __android_log_set_logger(keep);
+}
+
+LogCapture::~LogCapture() {
+  __android_log_set_logger(__android_log_stderr_logger);
+  __android_log_set_minimum_priority(priorityBefore);
+  lines.clear();
+}
+
+std::vector<LogLine> LogCapture::take() {
+  return std::exchange(lines, {});
+}
+
+}  // namespace senseloom::tool

@@ -1,0 +1,50 @@
+#pragma once
+
+#include <array>
+#include <cstddef>
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "plot/record_hues.h"
+#include "plot/timeline.h"
+
+namespace senseloom::tool {
+
+// What one lane of a picture shows, in the bins of a timeline: the records of a sensor, or what a client received.
+class PlotLane {
+ public:
+  enum class Presence : uint8_t { same, opens, closes };
+  struct Bin {
+    RecordHues received;
+    RecordHues last;                     // ... of that, the last record
+    Presence presence = Presence::same;  // the last change within the bin
+    bool asks = false;                   // an option was set
+    bool isRefused = false;              // ... and refused
+    bool negotiates = false;
+  };
+  struct Note {
+    size_t bin;
+    std::string text;
+  };
+
+  explicit PlotLane(std::string laneName) : name(std::move(laneName)) {}
+
+  void receive(size_t bin, const RecordHues& record);
+  void fold();
+  // Notes beyond a number that fits no picture are left out.
+  void addNote(size_t bin, std::string text);
+  Bin& at(size_t bin) { return bins[bin]; }
+  const Bin& at(size_t bin) const { return bins[bin]; }
+  const std::vector<Note>& allNotes() const { return notes; }
+
+  const std::string name;
+  size_t offered = 0;  // records
+  size_t results = 0;
+
+ private:
+  std::vector<Bin> bins{Timeline::kPlaces};
+  std::vector<Note> notes;
+};
+
+}  // namespace senseloom::tool

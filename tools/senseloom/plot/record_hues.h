@@ -1,0 +1,43 @@
+#pragma once
+
+#include <array>
+#include <cstddef>
+#include <cstdint>
+#include <span>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "record_codec.h"
+
+namespace senseloom::tool {
+
+// What a picture tells apart by colour: the classes 0 to 7 or the sets of the first three classes, all others, and
+// records that show no class.
+inline constexpr size_t kHues = 10;
+inline constexpr size_t kOtherHue = 8;
+inline constexpr size_t kPlainHue = 9;
+
+// What a picture shows of one or more records.
+struct RecordHues {
+  std::array<uint32_t, kHues> counts{};  // by hue; of the items, where a record has items with classes
+  uint32_t height = 0;                   // the greatest number of steps, or of items
+  uint32_t records = 0;
+
+  void add(const RecordHues& other);
+};
+
+// How the records of a sensor are shown.
+struct RecordLook {
+  std::string_view sensor;
+  RecordHues (*look)(std::span<const uint8_t> record, bool isResult);
+  bool lasts = false;      // a class holds until the next record tells another
+  bool hasHeight = false;  // a number is shown as height
+  bool isClassSet = false;
+};
+const RecordLook& recordLookOf(const RecordLayout& sensor);
+
+// What a hue stands for. `names` are those of the classes from 0 on, as far as they have names.
+std::string hueText(const RecordLook& look, size_t hue, const std::vector<std::string>& names);
+
+}  // namespace senseloom::tool

@@ -1,0 +1,40 @@
+#pragma once
+
+#include <memory>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "plot/plot.h"
+#include "replayer.h"
+
+namespace senseloom::tool {
+
+// What the user says about a picture.
+struct PlotArguments {
+  std::string file = {};                     // empty: no picture is wanted
+  std::vector<std::string> classNames = {};  // from class 0 on
+};
+
+// Passes everything on to an output, and at the end writes a picture of the replay. Throws std::runtime_error when the
+// file can not be written: if it can not be opened, at once.
+class ReplayPlot final : public ReplayObserver {
+ public:
+  ReplayPlot(std::unique_ptr<ReplayObserver> replayOutput, std::string plotTitle, PlotArguments plotArguments);
+  void onOutcome(const CallOutcome& outcome) override;
+  void onEnd() override;
+
+ private:
+  void write() const;
+
+  std::unique_ptr<ReplayObserver> output;
+  const std::string title;
+  const PlotArguments arguments;
+  Plot plot;
+};
+
+// Adds a picture of a trace to an output, if one is wanted.
+std::unique_ptr<ReplayObserver> withPlot(std::unique_ptr<ReplayObserver> output, const std::string& trace,
+                                         const PlotArguments& arguments);
+
+}  // namespace senseloom::tool

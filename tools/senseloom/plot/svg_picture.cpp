@@ -1,0 +1,296 @@
+#include "plot/svg_picture.h"
+
+#include <algorithm>
+#include <array>
+#include <cmath>
+#include <string_view>
+#include <utility>
+
+#include "option_data.h"
+#include "plot/svg_lane.h"
+#include "plot/svg_text.h"
+
+namespace senseloom::tool {
+namespace {
+
+constexpr double kWidth = 1080;
+constexpr double kLeft = 150;  // of the lanes: names stand before them
+constexpr double kRight = 24;
+constexpr double kMargin = 20;
+constexpr double kRecordsHeight = 44;
+constexpr double kClientHeight = 24;
+constexpr double kNoteHeight = 18;  // above the lane of a client, for what it asks
+constexpr double kClientStride = kNoteHeight + kClientHeight + 8;
+constexpr double kCharacter = 5.9;  // about the width of one, to keep texts apart
+constexpr size_t kMostNameCharacters = 18;
+constexpr int kMostAxisMarks = 8;
+
+// Both palettes, hue by hue, and what else has a colour.
+struct ColourRow {
+  const char* selector;
+  const char* property;
+  const char* light;
+  const char* dark;
+};
+constexpr ColourRow kColours[] = {
+    {".back", "fill", "#ffffff", "#0d1117"},   {"text", "fill", "#1f2328", "#e6edf3"},
+    {".quiet", "fill", "#59636e", "#9198a1"},  {".note", "fill", "#59636e", "#9198a1"},
+    {".note", "stroke", "#ffffff", "#0d1117"}, {".open", "fill", "#eff2f5", "#21262d"},
+    {".tick", "stroke", "#1f2328", "#e6edf3"}, {".axis", "stroke", "#d1d9e0", "#3d444d"},
+    {".cut", "stroke", "#1f2328", "#e6edf3"},  {".ask", "fill", "#8250df", "#bc8cff"},
+    {".no", "stroke", "#d1242f", "#ff7b72"},   {".h0", "fill", "#b6bec8", "#5b6572"},
+    {".h1", "fill", "#4878b8", "#5c94dd"},     {".h2", "fill", "#3f9c5a", "#4bb16b"},
+    {".h3", "fill", "#d5504b", "#ee6a62"},     {".h4", "fill", "#ec9a2f", "#f2ab4a"},
+    {".h5", "fill", "#8a63b8", "#a583d6"},     {".h6", "fill", "#e3c63c", "#ecd65c"},
+    {".h7", "fill", "#3aa6a6", "#4cc0bf"},     {".h8", "fill", "#93694e", "#b58a6c"},
+    {".h9", "fill", "#6b7a8c", "#8795a8"},
+};
+
+std::string style() {
+  std::string light;
+  std::string dark;
+  for (const ColourRow& row : kColours) {
+    const std::string begin = std::string(row.selector) + '{' + row.property + ':';
+    light += begin + row.light + '}';
+    dark += begin + row.dark + '}';
+  }
+  return "<style>text{font:12px system-ui,-apple-system,\"Segoe UI\",Roboto,\"DejaVu Sans\",sans-serif}"
+         ".head{font-size:15px;font-weight:600}.name{font-weight:600}.small{font-size:11px}"
+         ".axis,.cut,.tick,.no{fill:none}.cut{stroke-dasharray:2 3;stroke-opacity:.7}.no{stroke-width:1.6}"
+         ".note{paint-order:stroke;stroke-width:4;stroke-linejoin:round}\n" +
+         light + "\n@media (prefers-color-scheme:dark){" + dark + "}</style>\n";
+}
+
+class Picture {
+ public:
+  Picture(const Plot& drawn, const std::vector<std::string>& names) : plot(drawn), classNames(names) {}
+
+  std::string draw(const std::string& title) {
+    y = kMargin + 12;
+    addText(kMargin, y, "head", title);
+    addText(kWidth - kRight, y, "quiet", "the records of a sensor, and what each client received of them", "end");
+    y += 10;
+    for (const Plot::Group& group : plot.sensorGroups()) addGroup(group);
+    addAxis();
+    addKey();
+    y = std::ceil(y);
+    const std::string size = coordinate(kWidth) + ' ' + coordinate(y);
+    return "<svg xmlns=\"http://www.w3.org/2000/svg\" viewBox=\"0 0 " + size + "\" width=\"" + coordinate(kWidth) +
+           "\" height=\"" + coordinate(y) + "\" role=\"img\">\n<title>" + xmlText(title) + "</title>\n" + style() +
+           "<rect class=\"back\" width=\"100%\" height=\"100%\"/>\n" + body + "</svg>\n";
+  }
+
+ private:
+  static double laneWidth() { return kWidth - kLeft - kRight; }
+  double xOf(size_t bin) const { return kLeft + laneWidth() * plot.time().placeOf(bin); }
+
+  void addText(double x, double baseline, const char* classes, std::string_view text, const char* anchor = "start") {
+    body += "<text x=\"" + coordinate(x) + "\" y=\"" + coordinate(baseline) + "\" class=\"" + classes + '"';
+    if (std::string_view(anchor) != "start") body += std::string(" text-anchor=\"") + anchor + '"';
+    body += '>' + xmlText(text) + "</text>\n";
+  }
+
+  void addPath(const char* classes, const std::string& path) {
+    if (!path.empty()) body += std::string("<path class=\"") + classes + "\" d=\"" + path + "\"/>\n";
+  }
+
+  void addGroup(const Plot::Group& group) {
+    const RecordLook& look = recordLookOf(*group.sensor);
+    y += 22;
+    addText(kMargin, y, "name", group.sensor->sensor);
+    addText(kMargin + 60, y, "quiet", findOptionDescription(group.sensor->sensor)->title);
+    addLegend(group, look);
+    y += 14;
+    const double top = y;
+    uint32_t most = 0;
+    for (size_t bin = 0; bin < Timeline::kBins; ++bin) most = std::max(most, group.records.at(bin).received.height);
+    for (const PlotLane& client : group.clients) {
+      for (size_t bin = 0; bin < Timeline::kBins; ++bin) most = std::max(most, client.at(bin).received.height);
+    }
+    addNames("records", grouped(group.records.offered), y + kRecordsHeight / 2);
+    body += SvgLane(plot.time(), look, {kLeft, y, laneWidth(), kRecordsHeight}).draw(group.records, most);
+    y += kRecordsHeight + 4;
+    for (const PlotLane& client : group.clients) addClient(client, look, most);
+    addNegotiations(group.records, top, y);
+    y -= kClientStride * static_cast<double>(group.clients.size());
+    for (const PlotLane& client : group.clients) addAsks(client);
+  }
+
+  void addLegend(const Plot::Group& group, const RecordLook& look) {
+    RecordHues all;
+    for (size_t bin = 0; bin < Timeline::kPlaces; ++bin) {
+      all.add(group.records.at(bin).received);
+      for (const PlotLane& client : group.clients) all.add(client.at(bin).received);
+    }
+    const double left = kMargin + 260;
+    double x = left;
+    for (size_t hue = 0; hue < kHues; ++hue) {
+      if (all.counts[hue] == 0) continue;
+      const std::string text = hueText(look, hue, classNames);
+      const double width = 16 + kCharacter * static_cast<double>(text.size()) + 16;
+      if (x + width > kWidth - kRight + 16 && x > left) {
+        x = left;
+        y += 18;
+      }
+      body += "<rect class=\"" + hueClass(hue) + "\" x=\"" + coordinate(x) + "\" y=\"" + coordinate(y - 10) +
+              "\" width=\"11\" height=\"11\" rx=\"2\"/>\n";
+      addText(x + 16, y, "small", text);
+      x += width;
+    }
+  }
+
+  void addNames(const std::string& name, const std::string& detail, double middle) {
+    addText(kMargin, middle - 2, "name", shortened(name, kMostNameCharacters));
+    addText(kMargin, middle + 12, "quiet small", detail);
+  }
+
+  void addClient(const PlotLane& client, const RecordLook& look, uint32_t most) {
+    y += kNoteHeight;
+    addNames(client.name, grouped(client.results) + " of " + grouped(client.offered), y + kClientHeight / 2);
+    addPresence(client);
+    body += SvgLane(plot.time(), look, {kLeft, y, laneWidth(), kClientHeight}).draw(client, most);
+    if (look.lasts) addResultTicks(client);
+    y += kClientStride - kNoteHeight;
+  }
+
+  // Where the client has a session.
+  void addPresence(const PlotLane& client) {
+    double from = -1;
+    const auto end = [&](double to) {
+      if (from >= 0 && to > from) {
+        body += "<rect class=\"open\" x=\"" + coordinate(from) + "\" y=\"" + coordinate(y) + "\" width=\"" +
+                coordinate(to - from) + "\" height=\"" + coordinate(kClientHeight) + "\"/>\n";
+      }
+      from = -1;
+    };
+    for (size_t bin = 0; bin < Timeline::kPlaces; ++bin) {
+      const auto presence = client.at(bin).presence;
+      if (presence == PlotLane::Presence::opens && from < 0) from = xOf(bin);
+      if (presence == PlotLane::Presence::closes) end(xOf(bin));
+    }
+    end(kLeft + laneWidth());
+  }
+
+  void addResultTicks(const PlotLane& client) {
+    std::string ticks;
+    for (size_t bin = 0; bin < Timeline::kBins; ++bin) {
+      if (client.at(bin).received.records == 0) continue;
+      ticks += 'M' + coordinate(xOf(bin)) + ' ' + coordinate(y + kClientHeight + 1) + "v4";
+    }
+    addPath("tick", ticks);
+  }
+
+  // What the client asks for, where it does; texts that would run into each other are left out.
+  void addAsks(const PlotLane& client) {
+    y += kNoteHeight;
+    double end = 0;
+    for (const PlotLane::Note& note : client.allNotes()) {
+      const double x = xOf(note.bin);
+      const double width = kCharacter * static_cast<double>(note.text.size());
+      const bool fits = x + 9 + width < kWidth - 4;
+      const double left = fits ? x + 9 : x - 9 - width;
+      if (left < end || left < kLeft - 4) continue;
+      addText(fits ? x + 9 : x - 9, y - 5, "note small", note.text, fits ? "start" : "end");
+      end = left + width + 12;
+    }
+    std::string taken;
+    std::string refused;
+    for (size_t bin = 0; bin < Timeline::kPlaces; ++bin) {
+      if (!client.at(bin).asks) continue;
+      const std::string at = coordinate(xOf(bin)) + ' ';
+      if (client.at(bin).isRefused) {
+        refused += 'M' + coordinate(xOf(bin) - 4) + ' ' + coordinate(y - 13) + "l8 8m0-8l-8 8";
+      } else {
+        taken += 'M' + at + coordinate(y - 14) + "l5 5-5 5-5-5z";
+      }
+    }
+    addPath("ask", taken);
+    addPath("no", refused);
+    y += kClientStride - kNoteHeight;
+  }
+
+  void addNegotiations(const PlotLane& records, double top, double bottom) {
+    std::string lines;
+    for (size_t bin = 0; bin < Timeline::kPlaces; ++bin) {
+      if (!records.at(bin).negotiates) continue;
+      lines += 'M' + coordinate(xOf(bin)) + ' ' + coordinate(top - 3) + 'V' + coordinate(bottom - 3);
+    }
+    addPath("cut", lines);
+  }
+
+  void addAxis() {
+    const Timeline& time = plot.time();
+    if (time.records() == 0) return;
+    y += 8;
+    std::string marks = 'M' + coordinate(kLeft) + ' ' + coordinate(y) + 'h' + coordinate(laneWidth());
+    const double span = time.last() - time.first();
+    const double step = std::max(axisStep(span, kMostAxisMarks), 1.0);
+    for (double value = std::ceil(time.first() / step) * step; value <= time.last(); value += step) {
+      const double x = kLeft + laneWidth() * (value - time.first()) / span;
+      marks += 'M' + coordinate(x) + ' ' + coordinate(y) + "v5";
+      addText(x, y + 18, "quiet small", grouped(static_cast<uint64_t>(value)), "middle");
+    }
+    addPath("axis", marks);
+    addText(kMargin, y + 18, "quiet small", time.isTime() ? "timestamp" : "record");
+    y += 18;
+  }
+
+  template <class Predicate>
+  bool anyBin(Predicate predicate) const {
+    for (const Plot::Group& group : plot.sensorGroups()) {
+      for (size_t bin = 0; bin < Timeline::kPlaces; ++bin) {
+        if (predicate(group.records.at(bin))) return true;
+        for (const PlotLane& client : group.clients) {
+          if (predicate(client.at(bin))) return true;
+        }
+      }
+    }
+    return false;
+  }
+
+  // What the marks mean, as far as there are any.
+  void addKey() {
+    const auto& groups = plot.sensorGroups();
+    y += 26;
+    double x = kLeft;
+    const auto explain = [&](const char* text) {
+      addText(x + 12, y, "quiet small", text);
+      x += 12 + kCharacter * static_cast<double>(std::string_view(text).size()) + 22;
+    };
+    if (anyBin([](const PlotLane::Bin& bin) { return bin.asks && !bin.isRefused; })) {
+      addPath("ask", 'M' + coordinate(x + 2) + ' ' + coordinate(y - 9) + "l5 5-5 5-5-5z");
+      explain("an option is set");
+    }
+    if (anyBin([](const PlotLane::Bin& bin) { return bin.isRefused; })) {
+      addPath("no", 'M' + coordinate(x - 2) + ' ' + coordinate(y - 8) + "l8 8m0-8l-8 8");
+      explain("an option is refused");
+    }
+    if (anyBin([](const PlotLane::Bin& bin) { return bin.negotiates; })) {
+      addPath("cut", 'M' + coordinate(x + 2) + ' ' + coordinate(y - 11) + "v14");
+      explain("the sensor negotiates");
+    }
+    if (std::any_of(groups.begin(), groups.end(), [](auto& group) { return recordLookOf(*group.sensor).lasts; })) {
+      addPath("tick", 'M' + coordinate(x + 2) + ' ' + coordinate(y - 7) + "v5");
+      explain("a result arrives");
+    }
+    body += "<rect class=\"open\" x=\"" + coordinate(x - 4) + "\" y=\"" + coordinate(y - 9) +
+            "\" width=\"12\" height=\"11\"/>\n";
+    explain("the session is open");
+    if (plot.isCut()) addText(kWidth - kRight, y, "quiet small", "more clients are not shown", "end");
+    y += kMargin;
+  }
+
+  const Plot& plot;
+  const std::vector<std::string>& classNames;
+  std::string body;
+  double y = 0;  // down to where the picture is drawn
+};
+
+}  // namespace
+
+void writeSvg(std::FILE* out, const Plot& plot, const std::string& title, const std::vector<std::string>& names) {
+  const std::string text = Picture(plot, names).draw(title);
+  std::fwrite(text.data(), 1, text.size(), out);
+}
+
+}  // namespace senseloom::tool

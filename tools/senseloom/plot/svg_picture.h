@@ -1,0 +1,15 @@
+#pragma once
+
+#include <cstdio>
+#include <string>
+#include <vector>
+
+#include "plot/plot.h"
+
+namespace senseloom::tool {
+
+// Writes a plot as an SVG file that needs nothing else, on a light or a dark ground as the viewer prefers. `names` are
+// the names of the classes, from class 0 on, as far as they have any.
+void writeSvg(std::FILE* out, const Plot& plot, const std::string& title, const std::vector<std::string>& names);
+
+}  // namespace senseloom::tool

@@ -1,0 +1,31 @@
+#pragma once
+
+#include <chrono>
+#include <cstdint>
+#include <cstdio>
+
+namespace senseloom::tool {
+
+// A bar on a terminal that says how much of some work is done. It leaves the cursor at the start of its line, so that a
+// line that somebody else prints covers it, and it is gone at its end.
+class ProgressBar {
+ public:
+  using Clock = std::chrono::steady_clock;
+
+  ProgressBar(std::FILE* stream, uint64_t whole, Clock::time_point (*timeSource)() = Clock::now)
+      : terminal(stream), total(whole), now(timeSource) {}
+  ~ProgressBar();
+  ProgressBar(const ProgressBar&) = delete;
+  ProgressBar& operator=(const ProgressBar&) = delete;
+
+  // Draws the bar if it was not drawn within the last tenth of a second.
+  void show(uint64_t done);
+
+ private:
+  std::FILE* terminal;
+  uint64_t total;
+  Clock::time_point (*now)();
+  Clock::time_point nextDrawing = Clock::time_point::min();
+};
+
+}  // namespace senseloom::tool
