@@ -9,7 +9,8 @@
  *
  *  1. Threads: none are created and nothing is locked. All functions of a process are called from one thread at a time.
  *  2. Errors: functions that return int return -1 for every failure, functions that return a pointer return NULL. A
- *     failed allocation is such a failure: it leaves no session and no sensor half changed. Nothing is ever thrown.
+ *     failed allocation is such a failure: it leaves no session and no sensor half changed, but for what a session's own
+ *     option took of its string before. Nothing is ever thrown.
  *  3. Handles: a session handle is an opaque pointer. It is valid from ctx_open_session() until it is passed to
  *     ctx_close_session(); a closed handle is refused with -1, until a later session happens to get the same value.
  *  4. Records and results: integers are in the platform's byte order, little-endian on the target. Records need no

@@ -6,8 +6,8 @@
 #include "registry/registry.h"
 #include "senseloom.h"
 
-// The entry points. Only a failed allocation ever throws, and nothing is changed for good before all that can throw is
-// done.
+// The entry points. Only a failed allocation ever throws, and before all that can throw is done nothing is changed, but
+// for what a session's own option takes of its string.
 using namespace senseloom;
 
 void* ctx_open_session(const char* sensorName) noexcept try {

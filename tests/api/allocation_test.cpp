@@ -243,7 +243,7 @@ TEST(FailedAllocation, LeaksNothing) {
 
 // What the session's own option took of the string stays, and is in force from the negotiation on, though without a
 // list.
-TEST(FailedAllocation, SetsNoOptionByHalf) {
+TEST(FailedAllocation, LeavesTheOptionAsItsStringSetIt) {
   bool succeeded = false;
   for (int failing = 0; !succeeded; ++failing) {
     SCOPED_TRACE(failing);

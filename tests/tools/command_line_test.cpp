@@ -18,6 +18,7 @@ TEST(CommandLine, PrintsTheVersion) {
 TEST(CommandLine, HelpsWithEveryCommand) {
   EXPECT_NE(runTool({"--help"}).out.find("replay"), std::string::npos);
   EXPECT_NE(runTool({"replay", "--help"}).out.find("--quiet"), std::string::npos);
+  EXPECT_NE(runTool({"record", "--help"}).out.find("-o,--output"), std::string::npos);
   EXPECT_NE(runTool({"generate", "--help"}).out.find("commute"), std::string::npos);
   EXPECT_NE(runTool({"generate", "commute", "--help"}).out.find("--seed"), std::string::npos);
   EXPECT_NE(runTool({"sensors", "--help"}).out.find("SENSOR"), std::string::npos);
@@ -34,7 +35,12 @@ TEST(CommandLine, RefusesWhatItDoesNotUnderstandWithStatus2) {
       {"replay", "--json", "--quiet", "lift.jsonl"},
       {"replay", "--all", "--quiet", "lift.jsonl"},
       {"replay", "--all", "--json", "lift.jsonl"},
+      {"replay", "--check", "--all", "lift.jsonl"},
+      {"replay", "--check", "--json", "lift.jsonl"},
+      {"replay", "--check", "--quiet", "lift.jsonl"},
       {"replay", "--log", "loud", "lift.jsonl"},
+      {"record"},
+      {"record", "--"},
       {"generate"},
       {"generate", "commute"},
       {"generate", "commute", "--seed", "-1"},

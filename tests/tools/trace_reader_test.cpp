@@ -122,6 +122,46 @@ TEST_F(TraceReading, TakesANullOptionForANullPointer) {
   EXPECT_EQ(call->option, std::nullopt);
 }
 
+TEST_F(TraceReading, TakesAnOptionGivenAsBytes) {
+  TraceReader reader = readerOf(R"({"call":"set_option","session":"a","optionHex":"7bff00"})");
+  EXPECT_EQ(reader.next()->option, std::string("{\xff\0", 3));
+}
+
+TEST_F(TraceReading, SkipsNotesOnLinesOfTheirOwn) {
+  TraceReader reader = readerOf(R"({"note":"here we go","returned":-1}
+{"call":"uninit","note":"a call all the same"}
+{"note":null}
+)");
+  const auto call = reader.next();
+  ASSERT_TRUE(call);
+  EXPECT_EQ(call->line, 2U);
+  EXPECT_FALSE(reader.next());
+}
+
+TEST_F(TraceReading, GivesWhatWasRecordedOfACall) {
+  TraceReader reader = readerOf(R"({"call":"close","session":"a","properties":[],"returned":1,"note":"x","result":{}}
+{"call":"close","session":"a","returned":null}
+{"call":"close","session":"a","properties":[]}
+)");
+  EXPECT_EQ(compactText(reader.next()->recorded.get()), R"({"returned":1,"properties":[],"result":{}})");
+  EXPECT_EQ(compactText(reader.next()->recorded.get()), R"({"returned":null})");
+  EXPECT_EQ(reader.next()->recorded, nullptr);
+}
+
+TEST_F(TraceReading, CountsTheBytesOfTheLinesReadAndOfTheFile) {
+  TraceReader reader = readerOf("\n{\"call\":\"uninit\"}\n{\"call\":\"uninit\"}");
+  EXPECT_EQ(reader.size(), 36U);
+  EXPECT_EQ(reader.bytesRead(), 0U);
+  reader.next();
+  EXPECT_EQ(reader.bytesRead(), 19U);
+  reader.next();
+  EXPECT_EQ(reader.bytesRead(), 36U);
+}
+
+TEST_F(TraceReading, KnowsNoSizeOfWhatIsNoFile) {
+  EXPECT_EQ(TraceReader("/dev/null").size(), 0U);
+}
+
 TEST_F(TraceReading, NamesFileAndLineAsItsPosition) {
   TraceReader reader = readerOf("\n{\"call\":\"uninit\"}\n");
   EXPECT_EQ(reader.position(), file);
@@ -146,6 +186,9 @@ TEST_F(TraceReading, RefusesLinesThatAreNoCall) {
       {R"({"call":"set_option","session":"a"})", "missing \"option\""},
       {R"({"call":"set_option","session":"a","option":[]})", "\"option\" must be an object, a string or null"},
       {R"({"call":"set_option","session":"a","option":3})", "\"option\" must be an object, a string or null"},
+      {R"({"call":"set_option","session":"a","optionHex":"7"})",
+       "\"optionHex\" must hold hexadecimal digits, two a byte"},
+      {R"({"call":"set_option","session":"a","optionHex":7})", "\"optionHex\" must be a string"},
       {R"({"call":"dispatch","record":{}})", "a dispatch needs either \"session\" or \"sensor\""},
       {R"({"call":"dispatch","session":"a","sensor":"STAP","record":{}})",
        "a dispatch needs either \"session\" or \"sensor\""},
