@@ -1,4 +1,5 @@
-/*
+/**
+ * \file
  * senseloom: one context sensor, many clients, each with its own view of it.
  *
  * A process loads libsenseloom, opens sessions on named context sensors, gives each session an option string, and
@@ -26,8 +27,10 @@
 #include <stdbool.h>
 #include <stdint.h>
 
+/** Marks what the library exports. */
 #define SENSELOOM_API __attribute__((visibility("default")))
 
+/** Tells C++ that nothing is ever thrown. */
 #ifdef __cplusplus
 #define SENSELOOM_NOEXCEPT noexcept
 extern "C" {
@@ -35,17 +38,17 @@ extern "C" {
 #define SENSELOOM_NOEXCEPT
 #endif
 
-/*
+/**
  * One setting that the sensor is to run with. The value belongs to the library: it stays as it is until the next
  * ctx_set_option() or ctx_close_session() on a session of the same sensor, or ctx_uninit(), and is stale from then on.
  */
 typedef struct ctx_property {
-  int32_t id;   /* property identifier; which ones a sensor has is listed by `senseloom sensors` */
-  int32_t size; /* length of the value in bytes: 4 (one int32_t), but for gesture template bytes (id 123) */
-  void *value;  /* the value; not owned by the list */
+  int32_t id;   /**< property identifier; which ones a sensor has is listed by `senseloom sensors` */
+  int32_t size; /**< length of the value in bytes: 4 (one int32_t), but for gesture template bytes (id 123) */
+  void *value;  /**< the value; not owned by the list */
 } ctx_property_t;
 
-/* A property list: `count` entries, which may be 0. Released as a whole with ctx_option_release(). */
+/** A property list: `count` entries, which may be 0. Released as a whole with ctx_option_release(). */
 #ifdef __cplusplus /* C++ knows the flexible array member of C99 as an extension */
 #pragma GCC diagnostic push
 #pragma GCC diagnostic ignored "-Wpedantic"
@@ -54,14 +57,14 @@ typedef struct ctx_property {
 #endif
 #endif
 typedef struct ctx_option {
-  int32_t count;
-  ctx_property_t properties[];
+  int32_t count;               /**< number of entries */
+  ctx_property_t properties[]; /**< the entries */
 } ctx_option_t;
 #ifdef __cplusplus
 #pragma GCC diagnostic pop
 #endif
 
-/*
+/**
  * Opens a session on a context sensor. Sensor names are matched exactly, on their first 9 characters: "PHYAC", "STAP",
  * "GSFLK", "SHAKI", "ISACT", "SCOUN", "GSPX", "DTWGS", "GSETH", "LPE_P", "PDR", "LIFT". The first session of "LPE_P"
  * switches the platform's aware audio session on.
@@ -71,7 +74,7 @@ typedef struct ctx_option {
  */
 SENSELOOM_API void *ctx_open_session(const char *sensor) SENSELOOM_NOEXCEPT;
 
-/*
+/**
  * Gives a session its option, a NUL-terminated JSON object, and negotiates: the options of all sessions of the sensor
  * are merged anew and every one of these sessions starts over with the outcome (a batch that was being collected is
  * dropped). `reserved` is not read.
@@ -85,7 +88,7 @@ SENSELOOM_API void *ctx_open_session(const char *sensor) SENSELOOM_NOEXCEPT;
 SENSELOOM_API int ctx_set_option(void *handle, int32_t reserved, const char *option,
                                  ctx_option_t **out) SENSELOOM_NOEXCEPT;
 
-/*
+/**
  * Passes one record of `len` bytes (0 is accepted) to a session.
  *
  * Returns 1 with the result in `*out` and its length in bytes in `*outlen`; 0 when there is nothing to deliver now
@@ -94,7 +97,7 @@ SENSELOOM_API int ctx_set_option(void *handle, int32_t reserved, const char *opt
  */
 SENSELOOM_API int ctx_dispatch_data(void *handle, void *data, int len, void **out, int *outlen) SENSELOOM_NOEXCEPT;
 
-/*
+/**
  * Closes a session. When others remain on the sensor their options are merged anew, and every one of them starts over
  * with the outcome; when it was the last, the sensor is stopped.
  *
@@ -105,80 +108,81 @@ SENSELOOM_API int ctx_dispatch_data(void *handle, void *data, int len, void **ou
  */
 SENSELOOM_API int ctx_close_session(void *handle, ctx_option_t **option) SENSELOOM_NOEXCEPT;
 
-/* Frees a property list, but none of the values it points at. NULL is harmless. Always returns 0. */
+/** Frees a property list, but none of the values it points at. NULL is harmless. Always returns 0. */
 SENSELOOM_API int32_t ctx_option_release(ctx_option_t *list) SENSELOOM_NOEXCEPT;
 
-/*
+/**
  * Deletes the twelve sensors. Sessions stay open: they still take records, and are closed as usual, but negotiate with
  * nobody. No sensor is stopped, so the platform's aware audio session stays on. The next call that needs the sensors
  * makes new ones. Does nothing when there are none.
  */
 SENSELOOM_API void ctx_uninit(void) SENSELOOM_NOEXCEPT;
 
-/*
+/**
  * The sensor of that name as an opaque pointer; NULL for NULL, for any other name, and before the first call that makes
  * the sensors (this one never does). After ctx_uninit() it still returns the old pointers, which must not be used,
  * until the sensors are made anew.
  */
 SENSELOOM_API void *getSensor(const char *name) SENSELOOM_NOEXCEPT;
 
-/*
+/**
  * The audio bridge: the platform's "aware" audio session, which the "LPE_P" sensor switches on with its first session and
  * off with its last. The functions can be used on their own, too. They load the module of class "aware" and instance
  * "primary" through the platform's hardware loader (hw_get_module_by_class() of libhardware) and open its device
  * "aware_hw_if", whose API version must be 2.0.
  */
 
-/* The opened device: a structure that begins with the platform's hw_device_t. NULL while closed. */
 struct aware_hw_device;
+
+/** The opened device: a structure that begins with the platform's hw_device_t. NULL while closed. */
 SENSELOOM_API extern struct aware_hw_device *device;
 
-/* Whether the aware session is on. */
+/** Whether the aware session is on. */
 SENSELOOM_API extern bool gIsActivated;
 
-/* Opens the device if it is not open. Returns whether it is open now; a device of a wrong version counts as failure. */
+/** Opens the device if it is not open. Returns whether it is open now; a device of a wrong version counts as failure. */
 SENSELOOM_API bool audio_hal_init(void) SENSELOOM_NOEXCEPT;
 
-/* Opens the device if it is not open and switches the aware session on if it is off. Returns whether it is on now. */
+/** Opens the device if it is not open and switches the aware session on if it is off. Returns whether it is on now. */
 SENSELOOM_API bool audio_hal_activate(void) SENSELOOM_NOEXCEPT;
 
-/*
+/**
  * Opens the device if it is not open. If the aware session is on, switches it off and closes the device. Returns whether
  * the session is off now; false also when the device could not be opened.
  */
 SENSELOOM_API bool audio_hal_deactivate(void) SENSELOOM_NOEXCEPT;
 
-/*
+/**
  * A growable array of elements of one size. The record is the caller's and is read and written freely by it; only the
  * storage is the array's. Elements move when the array grows, so a pointer to one is good until the next va_new().
  */
 typedef struct varray {
-  int32_t count;    /* elements in use */
-  int32_t capacity; /* elements that the storage holds: 16, doubled as needed, never less again */
-  int32_t elemSize; /* bytes of an element */
-  void *data;       /* the storage */
+  int32_t count;    /**< elements in use */
+  int32_t capacity; /**< elements that the storage holds: 16, doubled as needed, never less again */
+  int32_t elemSize; /**< bytes of an element */
+  void *data;       /**< the storage */
 } varray_t;
 
-/*
+/**
  * Makes the record an empty array of elements of `elemSize` bytes. Storage that it held before is not freed. Returns the
  * storage; NULL with the record untouched when `va` is NULL or `elemSize` is not positive, and NULL with the record set
  * when memory ran out.
  */
 SENSELOOM_API void *_va_init(varray_t *va, int elemSize) SENSELOOM_NOEXCEPT;
 
-/*
+/**
  * Appends an element and returns it for the caller to write: zero-filled, or with the bytes of a deleted element. NULL,
  * with the array as it was, when `va` is NULL or has no storage, memory ran out, or 2^30 elements are in use.
  */
 SENSELOOM_API void *va_new(varray_t *va) SENSELOOM_NOEXCEPT;
 
-/*
+/**
  * Copies element `index` to `out`, removes it and closes the gap. Returns `out`; NULL, with the array as it was, when
  * `va` or `out` is NULL or there is no such element.
  */
 SENSELOOM_API void *_va_del(varray_t *va, int index, void *out) SENSELOOM_NOEXCEPT;
 
-/* Frees the storage and zeroes the record. NULL is harmless, and so is an array that was freed before. */
+/** Frees the storage and zeroes the record. NULL is harmless, and so is an array that was freed before. */
 SENSELOOM_API void va_free(varray_t *va) SENSELOOM_NOEXCEPT;
 
 #ifdef __cplusplus

@@ -8,7 +8,7 @@ set -euo pipefail
 # Per task: packages that are programs or headers, and libraries, which 32-bit x86 needs in its own version, too.
 declare -A programs=(
   [build]="g++ cmake ninja-build libcli11-dev"
-  [test]="abigail-tools binutils clang dpkg-dev file groff-base libc++-dev pkg-config python3 valgrind"
+  [test]="abigail-tools binutils clang doxygen dpkg-dev file groff-base libc++-dev pkg-config python3 valgrind"
   [bench]="libboost-dev librange-v3-dev"
   [fuzz]="clang"
   [lint]="clang-format clang-tidy codespell cppcheck shellcheck"
