@@ -28,7 +28,7 @@ void ProcMixerActivity::mix() {
   uint32_t total = 0;
   uint32_t weight = kFirstWeight;
   if (weight >> weightShift == 0) {  // all weigh the same
-#pragma GCC unroll 4
+#pragma GCC unroll 8
     for (int i = 0; i < count; ++i) scores[ActivityRecord::at(batch + i * ActivityRecord::kSize).classId()] += weight;
     total = static_cast<uint32_t>(count) * weight;
   } else {
