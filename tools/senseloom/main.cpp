@@ -6,6 +6,7 @@
 #include <cerrno>
 #include <cstdint>
 #include <cstdio>
+#include <cstdlib>
 #include <cstring>
 #include <exception>
 #include <functional>
@@ -50,9 +51,28 @@ struct ReplayArguments {
   bool quiet = false;
   bool all = false;
   bool check = false;
-  std::string log = "warn";  // shows what was rejected, but not each negotiation
+  std::string log;
   PlotArguments plot;
 };
+
+// The level for all tags in the environment's ANDROID_LOG_TAGS, as in "*:v"; the liblog of a host does not read it.
+std::string defaultLogLevel() {
+  const char* const tags = std::getenv("ANDROID_LOG_TAGS");
+  const char* const all = tags != nullptr ? std::strstr(tags, "*:") : nullptr;
+  switch (all != nullptr ? all[2] | 0x20 : '\0') {  // in lower case
+    case 'v':
+    case 'd':
+      return "debug";
+    case 'i':
+      return "info";
+    case 'e':
+      return "error";
+    case 's':
+      return "none";
+    default:
+      return "warn";  // shows what was rejected, but not each negotiation
+  }
+}
 
 std::unique_ptr<ReplayObserver> makeOutput(std::FILE* out, const ReplayArguments& arguments, const TraceReader& trace) {
   if (arguments.check) return std::make_unique<CheckOutput>(out, trace);
@@ -85,6 +105,7 @@ void addReplay(CLI::App& app, Action& action) {
   json->excludes(quiet)->excludes(all)->excludes(check);
   quiet->excludes(all)->excludes(check);
   check->excludes(all);
+  arguments->log = defaultLogLevel();
   command->add_option("--log", arguments->log, "print log lines from this level on, on standard error")
       ->check(CLI::IsMember({"debug", "info", "warn", "error", "none"}))
       ->capture_default_str();
