@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <cstring>
-#include <memory>
 #include <utility>
 
 #include "input_error.h"
@@ -12,21 +11,38 @@ namespace {
 
 constexpr int32_t kTemplateBytes = 123;
 
-struct ListRelease {
-  void operator()(ctx_option_t* list) const { ctx_option_release(list); }
-};
-
-// Copies a property list at once, since the next call makes its values stale, and releases it.
-std::optional<PropertyList> takeProperties(ctx_option_t* list) {
-  const std::unique_ptr<ctx_option_t, ListRelease> owner(list);
-  if (list == nullptr) return std::nullopt;
+// Copies a property list at once, since the next call makes its values stale.
+std::optional<PropertyList> copyOf(const senseloom::PropertyList& list) {
+  if (!list) return std::nullopt;
   PropertyList properties;
-  for (int32_t i = 0; i < list->count; ++i) {
-    const ctx_property_t& property = list->properties[i];
-    const auto* value = static_cast<const uint8_t*>(property.value);
-    properties.push_back({property.id, {value, value + property.size}});
+  for (const auto property : list) {
+    properties.push_back({property.id(), {property.bytes().begin(), property.bytes().end()}});
   }
   return properties;
+}
+
+int returnedBy(DispatchOutcome outcome) {
+  switch (outcome) {
+    case DispatchOutcome::delivered:
+      return 1;
+    case DispatchOutcome::nothing:
+      return 0;
+    case DispatchOutcome::refused:
+      break;
+  }
+  return -1;
+}
+
+int returnedBy(CloseOutcome outcome) {
+  switch (outcome) {
+    case CloseOutcome::sessionsRemain:
+      return 1;
+    case CloseOutcome::sensorStopped:
+      return 0;
+    case CloseOutcome::failed:
+      break;
+  }
+  return -1;
 }
 
 }  // namespace
@@ -38,14 +54,6 @@ std::optional<int32_t> Property::integer() const {
   return number;
 }
 
-Replayer::~Replayer() {
-  for (const Session& session : sessions) {
-    ctx_option_t* list = nullptr;
-    ctx_close_session(session.handle, &list);
-    ctx_option_release(list);
-  }
-}
-
 void Replayer::replay(TraceReader& trace) {
   try {
     while (const auto call = trace.next()) perform(*call);
@@ -53,10 +61,10 @@ void Replayer::replay(TraceReader& trace) {
     throw InputError(trace.position() + ": " + error.what());
   }
   // A session that never opened has nothing to close.
-  std::erase_if(sessions, [](const Session& session) { return session.handle == nullptr; });
+  std::erase_if(clients, [](const Client& client) { return !client.session; });
   TraceCall closing;
   closing.kind = CallKind::close;
-  while (!sessions.empty()) close(closing, sessions.begin());
+  while (!clients.empty()) close(closing, clients.begin());
   observer.onEnd();
 }
 
@@ -72,9 +80,8 @@ void Replayer::perform(const TraceCall& call) {
       if (call.sensor != nullptr) {
         dispatchToSensor(call);
       } else {
-        const Session& session = *require(call.session);
-        auto record = encodeRecord(*session.sensor, call.record.get());
-        dispatch(call, session, record);
+        Client& client = *require(call.session);
+        dispatch(call, client, encodeRecord(*client.sensor, call.record.get()));
       }
       break;
     case CallKind::close:
@@ -89,70 +96,64 @@ void Replayer::perform(const TraceCall& call) {
 
 void Replayer::open(const TraceCall& call) {
   const auto known = find(call.session);
-  if (known != sessions.end()) {
-    if (known->handle != nullptr) throw InputError("session \"" + call.session + "\" is already open");
-    sessions.erase(known);
+  if (known != clients.end()) {
+    if (known->session) throw InputError("session \"" + call.session + "\" is already open");
+    clients.erase(known);
   }
-  void* handle = ctx_open_session(call.sensor->sensor);
-  sessions.push_back({call.session, call.sensor, handle});
-  observer.onOutcome({.call = call, .session = call.session, .sensor = call.sensor, .failed = handle == nullptr});
+  clients.push_back({call.session, call.sensor, Session::open(call.sensor->sensor)});
+  observer.onOutcome({.call = call, .session = call.session, .sensor = call.sensor, .failed = !clients.back().session});
 }
 
-void Replayer::setOption(const TraceCall& call, const Session& session) {
-  ctx_option_t* list = nullptr;
-  const int returned = ctx_set_option(session.handle, 0, call.option ? call.option->c_str() : nullptr, &list);
+void Replayer::setOption(const TraceCall& call, Client& client) {
+  const OptionResult result = client.session.setOption(call.option ? call.option->c_str() : nullptr);
   observer.onOutcome({.call = call,
-                      .session = session.name,
-                      .sensor = session.sensor,
-                      .failed = returned < 0,
-                      .returned = returned,
-                      .properties = takeProperties(list)});
+                      .session = client.name,
+                      .sensor = client.sensor,
+                      .failed = !result.accepted,
+                      .returned = result.accepted ? 0 : -1,
+                      .properties = copyOf(result.properties)});
 }
 
-void Replayer::dispatch(const TraceCall& call, const Session& session, std::span<uint8_t> record) {
-  // The library takes a record of no bytes, but no null pointer.
-  uint8_t nothing = 0;
-  void* data = record.empty() ? &nothing : record.data();
-  void* result = nullptr;
-  int length = 0;
-  const int returned = ctx_dispatch_data(session.handle, data, static_cast<int>(record.size()), &result, &length);
-  CallOutcome outcome{
-      .call = call, .session = session.name, .sensor = session.sensor, .failed = returned < 0, .returned = returned};
-  if (returned == 1) outcome.result.emplace(static_cast<const uint8_t*>(result), static_cast<size_t>(length));
+void Replayer::dispatch(const TraceCall& call, Client& client, std::span<const uint8_t> record) {
+  const DispatchResult dispatched = client.session.dispatch(record);
+  CallOutcome outcome{.call = call,
+                      .session = client.name,
+                      .sensor = client.sensor,
+                      .failed = dispatched.outcome == DispatchOutcome::refused,
+                      .returned = returnedBy(dispatched.outcome)};
+  if (dispatched.outcome == DispatchOutcome::delivered) outcome.result = dispatched.result;
   outcome.record = record;
   observer.onOutcome(outcome);
 }
 
 void Replayer::dispatchToSensor(const TraceCall& call) {
-  auto record = encodeRecord(*call.sensor, call.record.get());
-  for (const Session& session : sessions) {
-    if (session.sensor == call.sensor && session.handle != nullptr) dispatch(call, session, record);
+  const auto record = encodeRecord(*call.sensor, call.record.get());
+  for (Client& client : clients) {
+    if (client.sensor == call.sensor && client.session) dispatch(call, client, record);
   }
 }
 
-void Replayer::close(const TraceCall& call, SessionIterator session) {
+void Replayer::close(const TraceCall& call, ClientIterator client) {
   // The session is gone whatever the library returns.
-  const Session closing = *session;
-  sessions.erase(session);
-  ctx_option_t* list = nullptr;
-  const int returned = ctx_close_session(closing.handle, &list);
+  Client closing = std::move(*client);
+  clients.erase(client);
+  const CloseResult result = closing.session.close();
   observer.onOutcome({.call = call,
                       .session = closing.name,
                       .sensor = closing.sensor,
-                      .failed = returned < 0,
-                      .returned = returned,
-                      .properties = takeProperties(list)});
+                      .failed = result.outcome == CloseOutcome::failed,
+                      .returned = returnedBy(result.outcome),
+                      .properties = copyOf(result.properties)});
 }
 
-Replayer::SessionIterator Replayer::find(const std::string& name) {
-  return std::find_if(sessions.begin(), sessions.end(),
-                      [&name](const Session& session) { return session.name == name; });
+Replayer::ClientIterator Replayer::find(const std::string& name) {
+  return std::find_if(clients.begin(), clients.end(), [&name](const Client& client) { return client.name == name; });
 }
 
-Replayer::SessionIterator Replayer::require(const std::string& name) {
-  const auto session = find(name);
-  if (session == sessions.end()) throw InputError("no session \"" + name + "\" is open");
-  return session;
+Replayer::ClientIterator Replayer::require(const std::string& name) {
+  const auto client = find(name);
+  if (client == clients.end()) throw InputError("no session \"" + name + "\" is open");
+  return client;
 }
 
 }  // namespace senseloom::tool

@@ -8,7 +8,7 @@
 #include <vector>
 
 #include "record_codec.h"
-#include "senseloom.h"
+#include "senseloom.hpp"
 #include "trace_reader.h"
 
 namespace senseloom::tool {
@@ -51,7 +51,7 @@ class Replayer {
  public:
   explicit Replayer(ReplayObserver& listener) : observer(listener) {}
   // Closes the sessions that are open, without telling the observer.
-  ~Replayer();
+  ~Replayer() = default;
   Replayer(const Replayer&) = delete;
   Replayer& operator=(const Replayer&) = delete;
 
@@ -63,24 +63,24 @@ class Replayer {
   void perform(const TraceCall& call);
 
  private:
-  struct Session {
+  struct Client {
     std::string name;
     const RecordLayout* sensor;
-    void* handle;
+    Session session;
   };
-  using SessionIterator = std::vector<Session>::iterator;
+  using ClientIterator = std::vector<Client>::iterator;
 
   void open(const TraceCall& call);
-  void setOption(const TraceCall& call, const Session& session);
-  void dispatch(const TraceCall& call, const Session& session, std::span<uint8_t> record);
+  void setOption(const TraceCall& call, Client& client);
+  void dispatch(const TraceCall& call, Client& client, std::span<const uint8_t> record);
   void dispatchToSensor(const TraceCall& call);
-  void close(const TraceCall& call, SessionIterator session);
+  void close(const TraceCall& call, ClientIterator client);
 
-  SessionIterator find(const std::string& name);
-  SessionIterator require(const std::string& name);
+  ClientIterator find(const std::string& name);
+  ClientIterator require(const std::string& name);
 
   ReplayObserver& observer;
-  std::vector<Session> sessions;  // in opening order
+  std::vector<Client> clients;  // in opening order
 };
 
 }  // namespace senseloom::tool
