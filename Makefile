@@ -5,8 +5,8 @@ SHELL := /bin/bash
 .PHONY: demo test bench bench-count fuzz lint
 .SILENT:
 
-# $(call build,PRESET,CMAKE ARGUMENTS): quietly, unless it fails.
-build = { cmake --preset $(1) $(2) && cmake --build --preset $(1); } >build/$(1).log 2>&1 || { cat build/$(1).log; exit 1; }
+# $(call build,PRESET,CMAKE ARGUMENTS,TARGET): quietly, unless it fails.
+build = { cmake --preset $(1) $(2) && cmake --build --preset $(1) $(3:%=--target %); } >build/$(1).log 2>&1 || { cat build/$(1).log; exit 1; }
 
 # $(call install,TASKS)
 install = mkdir -p build && scripts/install-deps.sh $(1)
@@ -48,7 +48,7 @@ FUZZ_SECONDS := 60
 fuzz:
 	$(call install,build test fuzz)
 	for preset in $$(scripts/host-presets.sh fuzz-x86 fuzz-native); do \
-	  $(call build,$$preset,-DBUILD_TESTING=ON); \
+	  $(call build,$$preset,-DBUILD_TESTING=ON,fuzzers); \
 	  fuzz/run.sh $(FUZZ_SECONDS) build/$$preset || exit 1; \
 	done
 
