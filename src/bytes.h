@@ -38,9 +38,6 @@ inline uint64_t loadU64(std::span<const uint8_t> bytes, size_t offset) {
 inline void storeU16(std::span<uint8_t> bytes, size_t offset, uint16_t value) {
   store(bytes, offset, value);
 }
-inline void storeI32(std::span<uint8_t> bytes, size_t offset, int32_t value) {
-  store(bytes, offset, value);
-}
 
 // Kept apart for the compiler not to see how little it is at most: it would take a string instruction for the copy,
 // which starts far slower than memcpy() does.

@@ -18,10 +18,6 @@ constexpr const char* kInstance = "primary";
 constexpr const char* kInterface = "aware_hw_if";
 constexpr uint32_t kVersion = 0x200;  // device API version 2.0
 
-constexpr int32_t q15(double fraction) {
-  return static_cast<int32_t>(fraction * 32768);
-}
-
 constexpr AwareParameters kParameters = {
     .word0 = 128,
     .half4 = 12,
@@ -31,10 +27,10 @@ constexpr AwareParameters kParameters = {
     .word16 = -2,
     .word20 = -1,
     .word24 = 21,
-    .word28 = q15(0.475),
-    .word32 = q15(0.98),
-    .word36 = q15(0.2),
-    .word40 = q15(0.1),
+    .word28 = 15564,  // 0.475 in Q15, truncated, as the next ones
+    .word32 = 32112,  // 0.98
+    .word36 = 6553,   // 0.2
+    .word40 = 3276,   // 0.1
     .half44 = 64,
     .half46 = 4,
 };

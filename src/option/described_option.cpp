@@ -11,15 +11,8 @@ namespace {
 int32_t accept(const OptionKey& key, const char* tag, int32_t value) {
   if (key.range.contains(value)) return value;
   if (key.message != nullptr) __android_log_print(ANDROID_LOG_ERROR, tag, key.message, value);
-  switch (key.outOfRange) {
-    case OutOfRange::clamped:
-      return std::clamp(value, key.range.low, key.range.high);
-    case OutOfRange::kept:
-      return value;
-    case OutOfRange::replaced:
-      break;
-  }
-  return key.fallback;
+  if (key.outOfRange == OutOfRange::clamped) return std::clamp(value, key.range.low, key.range.high);
+  return key.outOfRange == OutOfRange::kept ? value : key.fallback;
 }
 
 }  // namespace

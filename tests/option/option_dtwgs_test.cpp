@@ -99,6 +99,7 @@ TEST_F(GestureTemplate, OnlyLowercaseDigitsGiveTheirValue) {
       {"gz", 35},                                            // 16 * 16 + 35
       {"/0", 0xf0},                                          // '/' counts -1
       {"0/", 0xff},                                          //
+      {"0{", 75},                                            // '{', the character after 'z', counts 123 - 48
   };
   for (const auto& [digits, byte] : rows) {
     EXPECT_TRUE(templates.setTemplate(1, (std::string("0001") + digits).c_str())) << digits;
