@@ -15,14 +15,15 @@ constexpr uint16_t kNoMajority = 6;  // the class that stands for "no class has 
 }  // namespace
 
 void ProcMixerActivity::mix() {
+  if (prev->bufferLength() != 1) return vote();
+  // What clients get who ask for nothing else: no vote to take, it has the majority.
+  const auto only = ActivityRecord::at(prev->buffer());
+  only.withClass(only.classId() < kVotedClasses ? only.classId() : 0).storeAt(buffer());
+}
+
+void ProcMixerActivity::vote() {
   const uint8_t* batch = prev->buffer();
   const int count = prev->bufferLength();
-  if (count == 1) {  // what clients get who ask for nothing else: no vote to take, it has the majority
-    const auto only = ActivityRecord::at(batch);
-    only.withClass(only.classId() < kVotedClasses ? only.classId() : 0).storeAt(buffer());
-    return;
-  }
-
   // Weights and sums wrap around in 32 bits: with weightVar 0 the weight of the 22nd record already does.
   std::array<uint32_t, kClassIds> scores{};
   uint32_t total = 0;

@@ -14,6 +14,8 @@ class ProcMixerActivity final : public ProcMixer {
 
  private:
   void mix() override;
+  // ... by a vote. Apart from mix(), for a batch of one to take no room for it.
+  [[gnu::noinline]] void vote();
 
   const uint32_t weightShift;  // 31 for weightVar -1, which leaves nothing to add to a weight of 1024
 };

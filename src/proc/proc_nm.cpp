@@ -14,8 +14,9 @@ bool ProcNM::gather(const void* data, int count) {
   const int taken = std::min(count, bufferLength() - filled);
   if (taken <= 0) return false;
   const auto size = static_cast<size_t>(elemSize);
-  copyBytes<sizeof(uint16_t)>(buffer() + static_cast<size_t>(filled) * size, data, static_cast<size_t>(taken) * size);
+  uint8_t* const end = buffer() + static_cast<size_t>(filled) * size;
   filled += taken;
+  copyBytes<sizeof(uint16_t)>(end, data, static_cast<size_t>(taken) * size);
   return filled == bufferLength();
 }
 

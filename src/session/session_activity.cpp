@@ -86,13 +86,14 @@ int SessionActivity::postProcess(void* data, int len, void** out, int* outLen) n
 
 int SessionActivity::deliver(void** out, int* outLen) {
   const auto result = work.bytes();
-  const size_t delivered = static_cast<size_t>(proc->bufferLength());
+  Proc& last = *proc;
+  const size_t delivered = static_cast<size_t>(last.bufferLength());
   const size_t bytes = delivered * ActivityRecord::kSize;
-  storeU16(result, kValueOffset, static_cast<uint16_t>(delivered));
-  copyBytes<ActivityRecord::kSize>(result.data() + kHeaderSize, proc->buffer(), bytes);
-  proc->reset();
   *out = result.data();
   *outLen = static_cast<int>(kHeaderSize + bytes);
+  storeU16(result, kValueOffset, static_cast<uint16_t>(delivered));
+  copyBytes<ActivityRecord::kSize>(result.data() + kHeaderSize, last.buffer(), bytes);
+  last.reset();
   return 1;
 }
 

@@ -14,8 +14,8 @@ int SessionPDR::postProcess(void* data, int len, void** out, int* outLen) noexce
   if (record.size() < kHeaderSize + static_cast<size_t>(count * kItemSize)) return -1;
 
   uint8_t* const end = work.bytes().data() + kHeaderSize + pendingCount * kItemSize;
-  copyBytes<kItemSize>(end, record.data() + kHeaderSize, static_cast<size_t>(count * kItemSize));
   pendingCount += count;
+  copyBytes<kItemSize>(end, record.data() + kHeaderSize, static_cast<size_t>(count * kItemSize));
   const int threshold = 1 << static_cast<const OptionPDR&>(*option).N();  // 0 to 6
   return pendingCount < threshold ? 0 : deliver(record, out, outLen);
 }
