@@ -2,7 +2,7 @@
 SHELL := /bin/bash
 
 .DEFAULT_GOAL := demo
-.PHONY: demo test bench bench-count fuzz lint
+.PHONY: demo test bench bench-count fuzz coverage memcheck mutants lint
 .SILENT:
 
 # $(call build,PRESET,CMAKE ARGUMENTS,TARGET): quietly, unless it fails.
@@ -51,6 +51,25 @@ fuzz:
 	  $(call build,$$preset,-DBUILD_TESTING=ON,fuzzers); \
 	  fuzz/run.sh $(FUZZ_SECONDS) build/$$preset || exit 1; \
 	done
+
+# Fails unless the tests run all of the library's code, every condition both ways.
+coverage:
+	$(call install,build test coverage)
+	for preset in $$(scripts/host-presets.sh coverage-x86); do \
+	  $(call build,$$preset,-DBUILD_TESTING=ON); \
+	  scripts/coverage.py build/$$preset || exit 1; \
+	done
+
+# Runs the tests under valgrind, in a build by the other compiler.
+memcheck:
+	$(call install,build test)
+	$(call build,memcheck,-DBUILD_TESTING=ON)
+	ctest --preset memcheck
+
+# Changes the library in one place at a time, and fails when too many of the changes go unnoticed by the tests.
+mutants:
+	$(call install,build test)
+	scripts/mutants.py
 
 lint:
 	$(call install,build test lint)

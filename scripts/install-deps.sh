@@ -2,15 +2,16 @@
 # Installs what building, testing or another task needs and the machine lacks, from Debian's packages. Prints nothing
 # when nothing is missing.
 #
-#   scripts/install-deps.sh [TASK...]    tasks: build (the default), test, bench, fuzz, lint
+#   scripts/install-deps.sh [TASK...]    tasks: build (the default), test, bench, fuzz, coverage, lint
 set -euo pipefail
 
 # Per task: packages that are programs or headers, and libraries, which 32-bit x86 needs in its own version, too.
 declare -A programs=(
   [build]="g++ cmake ninja-build libcli11-dev"
-  [test]="abigail-tools binutils clang doxygen dpkg-dev file groff-base libc++-dev pkg-config python3 valgrind"
+  [test]="abigail-tools binutils clang doxygen dpkg-dev file groff-base libc++-dev locales pkg-config python3 valgrind"
   [bench]="libboost-dev librange-v3-dev"
   [fuzz]="clang"
+  [coverage]="clang llvm"
   [lint]="clang-format clang-tidy codespell cppcheck shellcheck"
 )
 declare -A libraries=(
@@ -18,6 +19,7 @@ declare -A libraries=(
   [test]="libc6-dbg libgtest-dev"
   [bench]="libbenchmark-dev libsigc++-2.0-dev"
   [fuzz]="libclang-rt-14-dev"
+  [coverage]="libclang-rt-14-dev"
   [lint]=""
 )
 

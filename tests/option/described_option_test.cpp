@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "option/option_kinds.h"
+#include "option_test_support.h"
 
 namespace senseloom {
 namespace {
@@ -136,6 +137,18 @@ TEST(MergeRules, NeitherTheOrderNorTheStartOfANegotiationMattersUnlessOneSideDec
       }
     } while (std::ranges::next_permutation(order).found);
   });
+}
+
+// A kind that is data alone.
+inline constexpr OptionKey kPlainKeys[] = {{.name = "plain", .defaultValue = 5}};
+inline constexpr OptionProperty kPlainProperties[] = {{7, "computed", OptionProperty::kComputed}, {8, "plain", 0}};
+inline constexpr OptionDescription kPlain{
+    .sensor = "PLAIN", .title = "plain", .keys = kPlainKeys, .properties = kPlainProperties, .logTag = kLogTag};
+class OptionPlain final : public OptionKind<OptionPlain, kPlain> {};
+
+TEST(DescribedOption, ComputedPropertyIs0UnlessTheKindComputesIt) {
+  OptionPlain option;
+  EXPECT_EQ(entriesOf(listOf(option)), (std::vector<Property>{{7, 4, 0}, {8, 4, 5}}));
 }
 
 }  // namespace
