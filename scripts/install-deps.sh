@@ -10,16 +10,16 @@ declare -A programs=(
   [build]="g++ cmake ninja-build libcli11-dev"
   [test]="abigail-tools binutils clang doxygen dpkg-dev file groff-base libc++-dev locales pkg-config python3 valgrind"
   [bench]="libboost-dev librange-v3-dev"
-  [fuzz]="clang"
-  [coverage]="clang llvm"
+  [fuzz]="clang libclang-rt-14-dev" # brings the runtime libraries of both word sizes
+  [coverage]="clang libclang-rt-14-dev llvm"
   [lint]="clang-format clang-tidy codespell cppcheck shellcheck"
 )
 declare -A libraries=(
   [build]="libjansson-dev android-liblog-dev"
   [test]="libc6-dbg libgtest-dev"
   [bench]="libbenchmark-dev libsigc++-2.0-dev"
-  [fuzz]="libclang-rt-14-dev"
-  [coverage]="libclang-rt-14-dev"
+  [fuzz]=""
+  [coverage]=""
   [lint]=""
 )
 
@@ -51,7 +51,7 @@ if [ "$host" = amd64 ]; then dpkg --add-architecture i386; fi
 # An index that can not be fetched may well not be one that is needed: the installation decides.
 apt-get update >"$log" 2>&1 || true
 # shellcheck disable=SC2086 # one word a package
-if ! apt-get install -y --no-install-recommends $missing >>"$log" 2>&1; then
+if ! apt-get install -y --no-install-recommends --no-remove $missing >>"$log" 2>&1; then
   cat "$log" >&2
   exit 1
 fi

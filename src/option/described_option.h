@@ -40,7 +40,7 @@ class DescribedOption : public Option {
   // Called at the end of a successful parse, with the values as they were read.
   virtual void adjust(const Values& /*read*/) {}
   // The value of a property that shows no single setting.
-  virtual int32_t computeProperty(int32_t /*id*/) const { return 0; }  // not covered: kinds that have one override it
+  virtual int32_t computeProperty(int32_t /*id*/) const { return 0; }
 
   Values settings{};
 
