@@ -1,4 +1,5 @@
 #include <gtest/gtest.h>
+#include <malloc.h>
 
 #include <cstdlib>
 #include <cstring>
@@ -104,6 +105,12 @@ TEST_F(Array, DoublesWhenFullAndKeepsItsElements) {
   EXPECT_EQ(elements(), expected);
 }
 
+TEST_F(Array, TakesNoMoreMemoryThanItsSlotsNeed) {
+  EXPECT_LT(malloc_usable_size(array.data), 3U * 24);  // 16 slots, rounded up
+  fill(17);
+  EXPECT_LT(malloc_usable_size(array.data), 3U * 48);  // 32 slots
+}
+
 TEST_F(Array, SlotAfterGrowthIsZeroFilled) {
   fill(16);
   va_new(&array);
@@ -185,6 +192,16 @@ TEST_F(Array, FreeingZeroesTheRecordAndIsHarmlessAgain) {
     expectRecord(array, 0, 0, 0, nullptr);
   }
   va_free(nullptr);
+}
+
+TEST_F(Array, GrowsFromASingleSlotThatTheCallerMade) {
+  varray_t small = handMade(0, 1, std::malloc(1));
+  EXPECT_EQ(va_new(&small), small.data);
+  expectRecord(small, 1, 1, 1, small.data);
+  const void* second = va_new(&small);
+  EXPECT_EQ(second, static_cast<char*>(small.data) + 1);
+  expectRecord(small, 2, 2, 1, small.data);
+  va_free(&small);
 }
 
 TEST_F(Array, AppendsNothingWithoutStorage) {
