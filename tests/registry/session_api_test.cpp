@@ -153,6 +153,16 @@ TEST_F(OpenSession, FailsWithASensorThatDoesNotStart) {
   EXPECT_EQ(sessionsOf("LPE_P").size(), 1U);
 }
 
+TEST_F(OpenSession, SeldomMakesRoomForFurtherSessions) {
+  ASSERT_NE(open("LIFT"), nullptr);
+  handles.reserve(64);
+  const fake::AllocationCount allocations;
+  for (int i = 1; i < 64; ++i) ASSERT_NE(open("LIFT"), nullptr);
+  // Each time the session and its option; 6 times room for the sensor's sessions: 3, 7, 15, 31, 63, 127; 3 times room
+  // for all sessions, of which twice as many slots are enough: 32, 64, 128.
+  EXPECT_LE(allocations.made(), 2U * 63 + 6 + 3);
+}
+
 TEST_F(OpenSession, LeavesNothingBehindWhenMemoryRunsOut) {
   handles.reserve(4);
   for (size_t opened = 0; opened < 2; ++opened) {
