@@ -10,9 +10,9 @@
 
 A mutant is named by its file, the changed line as it is, and as it becomes; by no line number, so that the name lasts.
 
-A mutant is built like the product for the host's word size. When the shared library comes out the same to the byte, no
-test could tell, and the mutant does not count; neither does one that does not compile, nor one that is listed, with its
-reason, in mutants-equivalent.txt. The others are killed by any test of behaviour that fails, crashes or does not end:
+A mutant is built like the product for the host's word size, with the C++ library's checks of bounds on top. When the
+shared library comes out the same to the byte, no test could tell, and the mutant does not count; neither does one that
+does not compile, nor one that is listed, with its reason, in mutants-equivalent.txt. The others are killed by any test of behaviour that fails, crashes or does not end:
 those of tests/api first, which need no linking, then those of the file's folder, then the rest. Nothing is random:
 addresses and the seed of the tests are fixed.
 """
@@ -210,16 +210,18 @@ def listed_equivalents():
 
 # --- What becomes of them --------------------------------------------------------------------------------------------
 
-# Faster to build, and no different: the C++ library's headers precompiled, and tests that are not optimised.
-PRECOMPILED = """
+# The C++ library's headers precompiled, for speed, and its checks of bounds, which sanitizers' builds have, too.
+OF_THE_LIBRARY = """
+target_compile_definitions(senseloom_objects PRIVATE _GLIBCXX_ASSERTIONS)
 target_precompile_headers(senseloom_objects PRIVATE <algorithm> <array> <cstring> <iterator> <limits> <memory> <span>
                           <utility> <vector>)
 """
 
 
-def built_faster(file, text):
+def adapted(file, text):
+    """The text of a file for a build that takes less time: no test is optimised, and all use one precompiled header."""
     if file == "src/CMakeLists.txt":
-        return text + PRECOMPILED
+        return text + OF_THE_LIBRARY
     if file == "tests/CMakeLists.txt":
         return "add_compile_options(-O0 $<$<COMPILE_LANGUAGE:CXX>:-fno-rtti>)\n" + text
     if file.startswith("tests/") and file.endswith("/CMakeLists.txt"):
@@ -266,7 +268,7 @@ class Copy:
             return
         content = source.read_bytes()
         if file.endswith("CMakeLists.txt"):
-            content = built_faster(file, content.decode()).encode()
+            content = adapted(file, content.decode()).encode()
         if not target.exists() or target.read_bytes() != content:
             target.parent.mkdir(parents=True, exist_ok=True)
             target.write_bytes(content)
@@ -355,6 +357,7 @@ def fates_of(mutants, jobs, verbose):
         copies[0].calibrate(program)
 
     fates = {}
+    last_killers = {}  # by file: what killed one of its mutants often kills the next
     queue = iter(mutants)
     lock = threading.Lock()
 
@@ -367,9 +370,11 @@ def fates_of(mutants, jobs, verbose):
                 return
             folder = pathlib.PurePath(mutant.file).parts[1]
             order = sorted(programs, key=lambda program: (program.folder != "api", program.folder != folder,
+                                                          program.name != last_killers.get(mutant.file),
                                                           program.seconds))
             fate = copy.fate(mutant, order, library)
             with lock:
+                last_killers[mutant.file] = fate.split()[-1]
                 fates[mutant.name] = fate
                 if verbose:
                     print(f"{fate}: {mutant.name}", flush=True)
