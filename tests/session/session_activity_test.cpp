@@ -383,6 +383,18 @@ TEST_F(Activity, CanNotBuildBeforeTheFirstMergeAndKeepsItsChain) {
   EXPECT_EQ(feed(1, {0x0011, 0x0022}), record(1, {0x0011, 0x0022}));
 }
 
+TEST_F(Activity, ChainThatStaysAsItIsStartsOverWithoutMemory) {
+  negotiate(R"({"logN":1,"summary":0})");
+  EXPECT_EQ(feed(1, {0x0011}), kNothing);
+  {
+    const fake::FailingAllocation first(1);
+    EXPECT_EQ(session.buildProc(), 0);
+    EXPECT_FALSE(first.happened());
+  }
+  EXPECT_EQ(feed(2, {0x0022}), kNothing);
+  EXPECT_EQ(feed(3, {0x0033}), record(3, {0x0022, 0x0033}));
+}
+
 TEST_F(Activity, KeepsItsChainWhenMemoryRunsOut) {
   negotiate(R"({"logN":1,"summary":0})");
   EXPECT_EQ(feed(1, {0x0011}), kNothing);
