@@ -190,7 +190,7 @@ def mutants_of(file):
         line_end = text.find("\n", end)
         old = text[line_start:line_end]
         new = text[line_start:start] + replacement + text[end:line_end]
-        name = f"{file}: {without_comments(old)} ==> {without_comments(new)}"
+        name = f"{file}: {without_comments(old)} ==> {without_comments(new)}".rstrip()
         times[name] += 1
         if times[name] > 1:
             name += f" #{times[name]}"
