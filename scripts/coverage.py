@@ -74,7 +74,7 @@ def main():
                for number, text in enumerate(file.read_text().splitlines(), 1) if LET_OFF.search(text)}
 
     lines = {(file, line) for file, line, _ in code}
-    print(f"coverage: {len(lines)} places where code begins, {2 * len(true)} branches")
+    print(f"coverage: code on {len(lines)} lines, {2 * len(true)} branches")
     failures = [f"{place[0]}:{place[1]}: {', '.join(what)}" for place, what in gaps.items() if place not in let_off]
     failures += [f"{place[0]}:{place[1]}: is let off and covered" for place in let_off if place not in gaps]
     for file, line in sorted(let_off):
