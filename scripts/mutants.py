@@ -285,7 +285,7 @@ class Copy:
         return subprocess.run(["ninja", f"-j{jobs}", "--quiet", *targets], cwd=self.build, stdout=subprocess.DEVNULL,
                               stderr=subprocess.DEVNULL, check=False).returncode == 0
 
-    def library(self):
+    def built_library(self):
         return (self.build / "lib" / "libsenseloom.so").read_bytes()
 
     def passes(self, program, only, timeout):
@@ -329,7 +329,7 @@ class Copy:
         try:
             if not self.make(1, "senseloom"):
                 return "does not compile"
-            if self.library() == library:
+            if self.built_library() == library:
                 return "same code"
             for program in programs:
                 if not program.shared and not self.make(1, program.name):
@@ -362,7 +362,7 @@ def fates_of(mutants, jobs, verbose):
     lock = threading.Lock()
 
     def work(copy):
-        library = copy.library()
+        library = copy.built_library()
         while True:
             with lock:
                 mutant = next(queue, None)

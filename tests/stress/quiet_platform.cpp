@@ -1,39 +1,9 @@
 // A platform that always does what it is asked for, and keeps nothing of it: millions of calls are made.
 
-#include <hardware/hardware.h>
+#include <quiet_aware_module.h>
 
 #include <cstdint>
 #include <cstring>
-
-namespace {
-
-struct Device {
-  hw_device_t common;
-  int (*activate)(Device*, const void*);
-  int (*deactivate)(Device*);
-};
-
-Device aware_device = [] {
-  Device made{};
-  made.common.version = HARDWARE_DEVICE_API_VERSION(2, 0);
-  made.common.close = [](hw_device_t*) { return 0; };
-  made.activate = [](Device*, const void*) { return 0; };
-  made.deactivate = [](Device*) { return 0; };
-  return made;
-}();
-
-hw_module_methods_t methods = {[](const hw_module_t*, const char*, hw_device_t** opened) {
-  *opened = &aware_device.common;
-  return 0;
-}};
-
-const hw_module_t aware_module = [] {
-  hw_module_t made{};
-  made.methods = &methods;
-  return made;
-}();
-
-}  // namespace
 
 extern "C" {
 
@@ -42,7 +12,7 @@ int __android_log_print(int, const char*, const char*, ...) {
 }
 
 int hw_get_module_by_class(const char*, const char*, const hw_module_t** module) {
-  *module = &aware_module;
+  *module = &quiet::aware_module;
   return 0;
 }
 
