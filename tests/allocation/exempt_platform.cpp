@@ -1,5 +1,6 @@
 // Stands before each function of the fakes of the platform, so that what these allocate is exempt.
 
+#include <formatted.h>
 #include <hardware/hardware.h>
 
 #include <cstdarg>
@@ -77,12 +78,8 @@ int __wrap___android_log_print(int priority, const char* tag, const char* format
   const memory::Exempt exempt;
   va_list arguments;
   va_start(arguments, format);
-  va_list again;
-  va_copy(again, arguments);
-  std::string text(static_cast<size_t>(std::vsnprintf(nullptr, 0, format, arguments)), '\0');
+  const std::string text = fake::formatted(format, arguments);
   va_end(arguments);
-  std::vsnprintf(text.data(), text.size() + 1, format, again);
-  va_end(again);
   return __real___android_log_print(priority, tag, "%s", text.c_str());
 }
 

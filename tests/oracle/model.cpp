@@ -1,5 +1,6 @@
 #include "model.h"
 
+#include <formatted.h>
 #include <jansson.h>
 
 #include <algorithm>
@@ -719,13 +720,8 @@ bool Model::deactivate() {
 void Model::log(int priority, const char* tag, const char* format, ...) {
   va_list arguments;
   va_start(arguments, format);
-  va_list again;
-  va_copy(again, arguments);
-  std::string text(static_cast<size_t>(std::vsnprintf(nullptr, 0, format, arguments)), '\0');
+  outcome.log.push_back({priority, tag, fake::formatted(format, arguments)});
   va_end(arguments);
-  std::vsnprintf(text.data(), text.size() + 1, format, again);
-  va_end(again);
-  outcome.log.push_back({priority, tag, std::move(text)});
 }
 
 }  // namespace oracle

@@ -1,10 +1,11 @@
 #include "fake_platform.h"
 
 #include <cstdarg>
-#include <cstdio>
 #include <cstring>
 #include <ostream>
 #include <utility>
+
+#include "formatted.h"
 
 namespace fake {
 namespace {
@@ -81,13 +82,8 @@ extern "C" {
 int __android_log_print(int priority, const char* tag, const char* format, ...) {
   va_list arguments;
   va_start(arguments, format);
-  va_list again;
-  va_copy(again, arguments);
-  std::string text(static_cast<size_t>(std::vsnprintf(nullptr, 0, format, arguments)) + 1, '\0');
+  const std::string text = fake::formatted(format, arguments);
   va_end(arguments);
-  std::vsnprintf(text.data(), text.size(), format, again);
-  va_end(again);
-  text.pop_back();
   fake::platform().log.push_back({priority, tag, text});
   return static_cast<int>(text.size());
 }
