@@ -4,7 +4,7 @@
 set -euo pipefail
 cd "$(dirname "$0")/.."
 build=$1
-mapfile -t cpp < <(git ls-files '*.cpp' '*.h' '*.hpp' '*.c' ':!include/senseloom.h' ':!tests/android/sysroot')
+mapfile -t cpp < <(git ls-files '*.cpp' '*.h' '*.hpp' '*.c' ':!include/senseloom.h' ':!tests/install/android/sysroot')
 mapfile -t scripts < <(git ls-files '*.sh' .ci/run)
 mapfile -t library < <(git ls-files 'src/*.cpp')
 
@@ -12,7 +12,7 @@ clang-format --dry-run --Werror "${cpp[@]}"
 printf '%s\0' "${library[@]}" | xargs -0 -n 1 -P "$(nproc)" clang-tidy -p "$build" --quiet 2>/dev/null
 # cppcheck 2.10 does not know a function whose body is a try block.
 cppcheck --quiet --error-exitcode=1 --std=c++20 --language=c++ --enable=warning,performance,portability \
-  --suppress=syntaxError:src/registry/session_api.cpp -I include -I src "${library[@]}"
+  --suppress=syntaxError:src/api/session_api.cpp -I include -I src "${library[@]}"
 # "opton" is a text of the library, letter for letter; some tests mistype on purpose.
 codespell --ignore-words-list=opton,inout,stap,allone,opne,levle --skip='./build,./.git,./fuzz/corpus,*.svg,*.jsonl,LICENSE' .
 shellcheck "${scripts[@]}"

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "registry/context_sensor.h"
+#include "session/context_sensor.h"
 #include "session/session_kinds.h"
 
 namespace senseloom {

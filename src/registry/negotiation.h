@@ -2,7 +2,7 @@
 
 #include <memory>
 
-#include "registry/context_sensor.h"
+#include "session/context_sensor.h"
 
 namespace senseloom {
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "registry/context_sensor.h"
+#include "session/context_sensor.h"
 #include "registry/session_set.h"
 
 namespace senseloom {

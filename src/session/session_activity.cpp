@@ -8,7 +8,7 @@
 #include "proc/proc_mask.h"
 #include "proc/proc_mixer_activity.h"
 #include "proc/proc_nm.h"
-#include "registry/context_sensor.h"  // the one look upward: for the options of the other sessions, merged
+#include "session/context_sensor.h"  // the one look upward: for the options of the other sessions, merged
 #include "session/record.h"
 
 namespace senseloom {

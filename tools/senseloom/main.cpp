@@ -16,20 +16,20 @@
 #include <string>
 #include <vector>
 
-#include "check_output.h"
-#include "commute_generator.h"
+#include "replay/check_output.h"
+#include "generate/commute_generator.h"
 #include "explain/explain_command.h"
 #include "input_error.h"
-#include "json_output.h"
-#include "option_data.h"
+#include "replay/json_output.h"
+#include "sensors/option_data.h"
 #include "plot/replay_plot.h"
-#include "record_command.h"
-#include "replay_progress.h"
-#include "replayer.h"
-#include "sensors_command.h"
-#include "summary_output.h"
-#include "table_output.h"
-#include "trace_reader.h"
+#include "record/record_command.h"
+#include "replay/replay_progress.h"
+#include "replay/replayer.h"
+#include "sensors/sensors_command.h"
+#include "replay/summary_output.h"
+#include "replay/table_output.h"
+#include "trace/trace_reader.h"
 
 namespace senseloom::tool {
 namespace {

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <numeric>
 
-#include "text_table.h"
+#include "terminal/text_table.h"
 
 namespace senseloom::tool {
 

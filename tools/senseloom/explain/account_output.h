@@ -7,7 +7,7 @@
 #include <vector>
 
 #include "explain/verdict.h"
-#include "record_codec.h"
+#include "trace/record_codec.h"
 
 namespace senseloom::tool {
 

@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "record_field.h"
+#include "trace/record_field.h"
 
 namespace senseloom::tool {
 namespace {

@@ -7,11 +7,11 @@
 #include "explain/explainer.h"
 #include "explain/log_capture.h"
 #include "input_error.h"
-#include "json.h"
+#include "trace/json.h"
 #include "plot/replay_plot.h"
-#include "replay_progress.h"
-#include "replayer.h"
-#include "trace_reader.h"
+#include "replay/replay_progress.h"
+#include "replay/replayer.h"
+#include "trace/trace_reader.h"
 
 namespace senseloom::tool {
 namespace {

@@ -12,7 +12,7 @@
 #include "explain/merge_derivation.h"
 #include "explain/option_reading.h"
 #include "explain/session_model.h"
-#include "replayer.h"
+#include "replay/replayer.h"
 
 namespace senseloom::tool {
 

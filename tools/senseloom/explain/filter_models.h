@@ -1,7 +1,7 @@
 #pragma once
 
 #include "explain/session_model.h"
-#include "record_field.h"
+#include "trace/record_field.h"
 
 // The sessions that decide about each record by itself.
 namespace senseloom::tool {

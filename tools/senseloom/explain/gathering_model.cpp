@@ -3,7 +3,7 @@
 #include <cstddef>
 #include <utility>
 
-#include "record_field.h"
+#include "trace/record_field.h"
 
 namespace senseloom::tool {
 namespace {

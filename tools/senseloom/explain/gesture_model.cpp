@@ -4,7 +4,7 @@
 #include <iterator>
 #include <string_view>
 
-#include "record_field.h"
+#include "trace/record_field.h"
 
 namespace senseloom::tool {
 namespace {

@@ -4,8 +4,8 @@
 #include <string>
 #include <utility>
 
-#include "hex.h"
-#include "text_table.h"
+#include "trace/hex.h"
+#include "terminal/text_table.h"
 
 namespace senseloom::tool {
 namespace {

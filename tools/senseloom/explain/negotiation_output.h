@@ -5,7 +5,7 @@
 #include <vector>
 
 #include "explain/merge_derivation.h"
-#include "replayer.h"
+#include "replay/replayer.h"
 
 namespace senseloom::tool {
 

@@ -8,7 +8,7 @@
 #include <utility>
 
 #include "explain/nearest_name.h"
-#include "json.h"
+#include "trace/json.h"
 
 namespace senseloom::tool {
 namespace {

@@ -9,7 +9,7 @@
 #include "explain/log_capture.h"
 #include "explain/verdict.h"
 #include "explain/wishes.h"
-#include "record_codec.h"
+#include "trace/record_codec.h"
 
 namespace senseloom::tool {
 

@@ -5,7 +5,7 @@
 #include <string_view>
 #include <vector>
 
-#include "option_data.h"
+#include "sensors/option_data.h"
 
 namespace senseloom::tool {
 

@@ -3,8 +3,8 @@
 #include <algorithm>
 #include <utility>
 
-#include "json.h"
-#include "record_field.h"
+#include "trace/json.h"
+#include "trace/record_field.h"
 
 namespace senseloom::tool {
 namespace {

@@ -6,7 +6,7 @@
 
 #include "plot/plot_lane.h"
 #include "plot/timeline.h"
-#include "replayer.h"
+#include "replay/replayer.h"
 
 namespace senseloom::tool {
 

@@ -4,7 +4,7 @@
 #include <cstdlib>
 #include <iterator>
 
-#include "record_field.h"
+#include "trace/record_field.h"
 
 namespace senseloom::tool {
 namespace {

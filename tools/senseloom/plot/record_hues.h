@@ -8,7 +8,7 @@
 #include <string_view>
 #include <vector>
 
-#include "record_codec.h"
+#include "trace/record_codec.h"
 
 namespace senseloom::tool {
 

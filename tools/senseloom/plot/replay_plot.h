@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "plot/plot.h"
-#include "replayer.h"
+#include "replay/replayer.h"
 
 namespace senseloom::tool {
 

@@ -6,7 +6,7 @@
 #include <string_view>
 #include <utility>
 
-#include "option_data.h"
+#include "sensors/option_data.h"
 #include "plot/svg_lane.h"
 #include "plot/svg_text.h"
 

@@ -1,0 +1,27 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdio>
+
+#include "replay/replayer.h"
+#include "trace/trace_reader.h"
+
+namespace senseloom::tool {
+
+// Compares what each call came to with what the trace says of it, and prints where they differ. At the end prints the
+// number of calls compared, or throws std::runtime_error with the number of those that differ.
+class CheckOutput final : public ReplayObserver {
+ public:
+  CheckOutput(std::FILE* stream, const TraceReader& reader) : out(stream), trace(reader) {}
+  void onOutcome(const CallOutcome& outcome) override;
+  void onEnd() override;
+
+ private:
+  std::FILE* out;
+  const TraceReader& trace;
+  size_t compared = 0;
+  size_t different = 0;
+  size_t unrecorded = 0;
+};
+
+}  // namespace senseloom::tool

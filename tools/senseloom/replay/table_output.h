@@ -1,0 +1,30 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdio>
+#include <string>
+#include <string_view>
+
+#include "replay/replayer.h"
+
+namespace senseloom::tool {
+
+// Prints a table for people as the trace goes: a row a call and session, with what came of it in words. Long lists are
+// cut short.
+class TableOutput final : public ReplayObserver {
+ public:
+  // Records that delivered nothing have rows only if `withAll` is set.
+  TableOutput(std::FILE* stream, bool withAll) : out(stream), all(withAll) {}
+  void onOutcome(const CallOutcome& outcome) override;
+
+ private:
+  void printRow(std::string_view line, std::string_view call, std::string_view session, std::string_view sensor,
+                std::string_view returned, std::string_view text);
+
+  std::FILE* out;
+  bool all;
+  bool headed = false;
+  size_t sessionWidth = 8;  // grows with the longest name so far
+};
+
+}  // namespace senseloom::tool

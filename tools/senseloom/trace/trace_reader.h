@@ -1,0 +1,68 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <cstdio>
+#include <memory>
+#include <optional>
+#include <string>
+
+#include "trace/json.h"
+#include "trace/record_codec.h"
+
+namespace senseloom::tool {
+
+enum class CallKind { open, setOption, dispatch, close, uninit };
+
+// The name of a call in traces and in output.
+const char* callName(CallKind kind);
+
+// One call of a trace.
+struct TraceCall {
+  size_t line = 0;
+  CallKind kind = CallKind::uninit;
+  std::string session;                   // empty for uninit, and for a dispatch to a whole sensor
+  const RecordLayout* sensor = nullptr;  // of an open, and of a dispatch to a whole sensor
+  std::optional<std::string> option;     // of a set_option; nothing: a null pointer
+  Json record;                           // of a dispatch
+  Json recorded;                         // what a recording says it came to; null: nothing
+};
+
+// Reads a trace, JSON Lines with one call a line, a line at a time. Blank lines and lines with a "note" in place of a
+// call are skipped; members of a line beyond those of its call are ignored, which leaves room for notes there, too.
+class TraceReader {
+ public:
+  // "-" is standard input. Throws InputError when the file can not be opened.
+  explicit TraceReader(const std::string& file);
+
+  // The next call, or nothing at the end. Throws InputError when there is none on a line that is not blank.
+  std::optional<TraceCall> next();
+
+  // Where the last line was read, for messages: "FILE:LINE", or the file alone before the first one.
+  std::string position() const;
+
+  uint64_t bytesRead() const { return byteCount; }
+  // Bytes of the whole trace; 0 when it is not a file.
+  uint64_t size() const;
+
+ private:
+  struct Close {
+    void operator()(std::FILE* file) const;
+  };
+  struct Free {
+    void operator()(char* text) const;
+  };
+
+  Json nextObject();
+  bool readLine();
+
+  std::string name;
+  std::unique_ptr<std::FILE, Close> stream;
+  std::unique_ptr<char, Free> buffer;
+  size_t bufferSize = 0;
+  size_t lineLength = 0;
+  size_t lineNumber = 0;
+  uint64_t byteCount = 0;
+};
+
+}  // namespace senseloom::tool
