@@ -39,8 +39,8 @@ inline void storeU16(std::span<uint8_t> bytes, size_t offset, uint16_t value) {
   store(bytes, offset, value);
 }
 
-// Kept apart for the compiler not to see how little it is at most: it would take a string instruction for the copy,
-// which starts far slower than memcpy() does.
+// Out of line so that the compiler cannot see the bound: it would take a string instruction for the copy, which starts
+// far slower than memcpy() does.
 [[gnu::noinline]] inline void copyAnySize(uint8_t* to, const void* from, size_t size) {
   std::memcpy(to, from, size);
 }

@@ -1,92 +1,80 @@
-#include <algorithm>
+#include <cstdlib>
 #include <cstring>
-#include <utility>
 
-#include "registry/negotiation.h"
 #include "registry/registry.h"
 #include "senseloom.h"
 
-// The entry points. Only a failed allocation ever throws, and before all that can throw is done nothing is changed, but
-// for what a session's own option takes of its string.
+// The C functions for sessions and sensors: they check their arguments and turn what the registry throws, which is only
+// ever a failed allocation, into their failure value.
 using namespace senseloom;
 
-void* ctx_open_session(const char* sensorName) noexcept try {
-  if (!ensureSensors() || sensorName == nullptr) return nullptr;
-  // Only the first 9 characters take part in the look-up.
-  char name[10] = {};
-  std::strncpy(name, sensorName, sizeof name - 1);
-  ContextSensor* sensor = findSensor(name);
-  if (sensor == nullptr) return nullptr;
-
-  gSessions.reserveOne();
-  auto& sessions = sensor->sessions;
-  if (sessions.size() == sessions.capacity()) sessions.reserve(2 * sessions.size() + 1);
-  if (sessions.empty() && !sensor->onStart()) return nullptr;
-  // Without memory for the session the sensor stays started, on purpose: the next attempt starts it once more.
-  Session* session = sensor->createSession().release();
-  gSessions.insert(session);
-  sessions.push_back(session);
-  return session;
-} catch (...) {
-  return nullptr;
+void* ctx_open_session(const char* sensorName) noexcept {
+  try {
+    _init_senseloom();
+    if (sensorName == nullptr) return nullptr;
+    // Only the first 9 characters take part in the look-up.
+    char name[10] = {};
+    std::strncpy(name, sensorName, sizeof name - 1);
+    ContextSensor* sensor = findSensor(name);
+    return sensor != nullptr ? openSession(*sensor) : nullptr;
+  } catch (...) {
+    return nullptr;
+  }
 }
 
-int ctx_set_option(void* handle, int32_t /*reserved*/, const char* option, ctx_option_t** out) noexcept try {
+int ctx_set_option(void* handle, int32_t /*reserved*/, const char* option, ctx_option_t** out) noexcept {
   if (option == nullptr || handle == nullptr || out == nullptr) return -1;
   *out = nullptr;
-  if (!ensureSensors()) return -1;
-  Session* session = gSessions.find(handle);
-  if (session == nullptr) return -1;
-  ContextSensor* sensor = findSensor(session->name);
-  if (sensor == nullptr) return -1;
-  if (session->parseOption(option) != 0) return -1;
-
-  negotiate(*sensor, session->ownOption().clone(), out);
-  if (*out == nullptr) return -1;
-  return rebuildSessions(*sensor) ? 0 : -1;
-} catch (...) {
-  return -1;
+  try {
+    _init_senseloom();
+    Session* session = gSessions.find(handle);
+    return session != nullptr ? setOption(*session, option, out) : -1;
+  } catch (...) {
+    return -1;
+  }
 }
 
-// Apart from the function below, so that what it has to keep over the call is not kept for every record.
-[[gnu::noinline, gnu::cold]] static int dispatchFirst(void* handle, void* data, int len, void** out, int* outlen) {
-  return _init_senseloom() ? ctx_dispatch_data(handle, data, len, out, outlen) : -1;
-}
-
-int ctx_dispatch_data(void* handle, void* data, int len, void** out, int* outlen) noexcept {
-  if (data == nullptr || handle == nullptr || len < 0 || outlen == nullptr || out == nullptr) return -1;
-  if (!gInited) return dispatchFirst(handle, data, len, out, outlen);
+static inline int dispatch(void* handle, void* data, int len, void** out, int* outlen) {
   Session* session = gSessions.find(handle);
   return session != nullptr ? session->postProcess(data, len, out, outlen) : -1;
 }
 
-int ctx_close_session(void* handle, ctx_option_t** option) noexcept try {
+// Out of line so that the usual way of a record saves no registers for it.
+[[gnu::noinline, gnu::cold]] static int dispatchFirst(void* handle, void* data, int len, void** out, int* outlen) {
+  try {
+    _init_senseloom();
+    return dispatch(handle, data, len, out, outlen);
+  } catch (...) {
+    return -1;
+  }
+}
+
+int ctx_dispatch_data(void* handle, void* data, int len, void** out, int* outlen) noexcept {
+  if (data == nullptr || handle == nullptr || len < 0 || outlen == nullptr || out == nullptr) return -1;
+  return gInited ? dispatch(handle, data, len, out, outlen) : dispatchFirst(handle, data, len, out, outlen);
+}
+
+int ctx_close_session(void* handle, ctx_option_t** option) noexcept {
   if (option == nullptr || handle == nullptr) return -1;
   *option = nullptr;
-  if (!ensureSensors()) return -1;
-  Session* session = gSessions.find(handle);
-  if (session == nullptr) return -1;
-  ContextSensor* sensor = findSensor(session->name);
-
-  // The copy that the negotiation of the others starts from is the one thing that can fail, so it comes first.
-  std::unique_ptr<Option> merged;
-  if (sensor != nullptr) {
-    const auto& sessions = sensor->sessions;
-    const auto remaining =
-        std::find_if(sessions.begin(), sessions.end(), [&](auto* other) { return other != session; });
-    if (remaining != sessions.end()) merged = (*remaining)->ownOption().clone();
+  try {
+    _init_senseloom();
+    Session* session = gSessions.find(handle);
+    return session != nullptr ? closeSession(*session, option) : -1;
+  } catch (...) {
+    return -1;
   }
+}
 
-  gSessions.erase(session);
-  std::unique_ptr<Session> closing(session);
-  if (sensor == nullptr) return -1;
-  std::erase(sensor->sessions, session);
-  if (sensor->sessions.empty()) {
-    closing.reset();
-    return sensor->onStop() ? 0 : -1;
-  }
-  negotiate(*sensor, std::move(merged), option);
-  return rebuildSessions(*sensor) ? 1 : -1;
-} catch (...) {
-  return -1;
+int32_t ctx_option_release(ctx_option_t* list) noexcept {
+  std::free(list);
+  return 0;
+}
+
+void ctx_uninit() noexcept {
+  deleteSensors();
+}
+
+void* getSensor(const char* name) noexcept {
+  return findSensor(name);
 }

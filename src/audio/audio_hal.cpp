@@ -1,3 +1,5 @@
+#include "audio/audio_hal.h"
+
 #include <android/log.h>
 #include <hardware/hardware.h>
 
@@ -10,6 +12,7 @@
 constinit aware_hw_device* device = nullptr;
 constinit bool gIsActivated = false;
 
+namespace senseloom {
 namespace {
 
 constexpr const char* kTag = "aware_audio";
@@ -35,9 +38,17 @@ constexpr AwareParameters kParameters = {
     .half46 = 4,
 };
 
-// Opens the device if it is not open. A device of a wrong version stays open, and only the call that opened it fails,
-// on purpose: the next one finds it open and goes on with it.
-bool open() {
+bool openOrLog() {
+  if (openAudio()) return true;
+  __android_log_print(ANDROID_LOG_ERROR, kTag, "init audio hal failed");
+  return false;
+}
+
+}  // namespace
+
+// A device of a wrong version stays open, and only the call that opened it fails, on purpose: the next one finds it
+// open and goes on with it.
+bool openAudio() {
   if (device != nullptr) {
     __android_log_print(ANDROID_LOG_DEBUG, kTag, "It is already inited!");
     return true;
@@ -55,19 +66,7 @@ bool open() {
   return device->common.version == kVersion;
 }
 
-bool openOrLog() {
-  if (open()) return true;
-  __android_log_print(ANDROID_LOG_ERROR, kTag, "init audio hal failed");
-  return false;
-}
-
-}  // namespace
-
-bool audio_hal_init() noexcept {
-  return open();
-}
-
-bool audio_hal_activate() noexcept {
+bool activateAudio() {
   if (!openOrLog()) return false;
   if (gIsActivated) {
     __android_log_print(ANDROID_LOG_DEBUG, kTag, "already activated, return");
@@ -83,7 +82,7 @@ bool audio_hal_activate() noexcept {
   return true;
 }
 
-bool audio_hal_deactivate() noexcept {
+bool deactivateAudio() {
   if (!openOrLog()) return false;
   if (!gIsActivated) {
     __android_log_print(ANDROID_LOG_DEBUG, kTag, "already deactivated, return");
@@ -100,3 +99,5 @@ bool audio_hal_deactivate() noexcept {
   device = nullptr;
   return true;
 }
+
+}  // namespace senseloom

@@ -27,8 +27,3 @@ void Option::fillOptionAt(ctx_option_t* list, int index, int id, void* value, in
 }
 
 }  // namespace senseloom
-
-int32_t ctx_option_release(ctx_option_t* list) noexcept {
-  std::free(list);
-  return 0;
-}

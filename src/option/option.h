@@ -25,7 +25,7 @@ class Option {
   // A new option of the same kind with the same settings.
   virtual std::unique_ptr<Option> clone() const = 0;
 
-  // Stores a new property list, which describes this option and points into it, in `*out`; null when it can not be
+  // Stores a new property list, which describes this option and points into it, in `*out`; null when it cannot be
   // made. The caller releases it with ctx_option_release().
   virtual void setProperty(ctx_option_t** out) = 0;
 

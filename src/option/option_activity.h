@@ -1,6 +1,6 @@
 #pragma once
 
-#include "option/described_option.h"
+#include "option/integer_option.h"
 
 namespace senseloom {
 
@@ -18,12 +18,9 @@ inline constexpr OptionKey kActivityKeys[] = {
     // Any other value switches the flag on, although a missing key leaves it off: intended.
     {.name = "continuous", .range = {0, 1}, .fallback = 1, .merge = Merge::anySet},
 };
-inline constexpr OptionProperty kActivityProperties[] = {
-    {41, "mode", 0},
-    {43, "spans", OptionProperty::kComputed},
-    {44, "decisionsPerSpan", OptionProperty::kComputed},
-    {42, "classMask", 3},
-};
+inline constexpr OptionProperty kSpans{43, "spans"};
+inline constexpr OptionProperty kDecisionsPerSpan{44, "decisionsPerSpan"};
+inline constexpr OptionProperty kActivityProperties[] = {{41, "mode"}, kSpans, kDecisionsPerSpan, {42, "classMask"}};
 inline constexpr OptionDescription kActivity{
     .sensor = "PHYAC",
     .title = "physical activity",
@@ -34,24 +31,22 @@ inline constexpr OptionDescription kActivity{
         "property 43: 1 << the largest \"logN\" as given, in the high 16 bits; 1 << the smallest in the low 16 bits",
 };
 
-class OptionActivity final : public OptionKind<OptionActivity, kActivity> {
+class OptionActivity final : public IntegerOption<OptionActivity, kActivity> {
  public:
   void merge(const Option& other) override;
 
-  int32_t mode() const { return settings[0]; }
-  int32_t logN() const { return settings[1]; }
-  int32_t logM() const { return settings[2]; }
-  int32_t classMask() const { return settings[3]; }
-  int32_t summary() const { return settings[4]; }
-  int32_t weightVar() const { return settings[5]; }
-  int32_t continuous() const { return settings[6]; }
-  int32_t maxLogN() const { return largestLogN; }
+  int32_t mode() const { return setting<kind.key("mode")>(); }
+  int32_t logN() const { return setting<kind.key("logN")>(); }
+  int32_t logM() const { return setting<kind.key("logM")>(); }
+  int32_t classMask() const { return setting<kind.key("classMask")>(); }
+  int32_t summary() const { return setting<kind.key("summary")>(); }
+  int32_t weightVar() const { return setting<kind.key("weightVar")>(); }
 
  private:
-  void adjust(const Values& read) override;
-  int32_t computeProperty(int32_t id) const override;
+  void adjust(const Settings& given) override;
+  int32_t compute(const OptionProperty& property) const override;
 
-  int32_t largestLogN = 0;
+  int32_t maxLogN = 0;  // after a parse "logN" as it was given, not clamped; after a merge the largest of all
 };
 
 }  // namespace senseloom

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "option/described_option.h"
+#include "option/integer_option.h"
 
 namespace senseloom {
 
@@ -8,7 +8,7 @@ inline constexpr OptionKey kAudioClassificationKeys[] = {
     {.name = "interval", .defaultValue = 5000, .merge = Merge::takeLast},
 };
 // Id 0 is on purpose: this is the one property that has it.
-inline constexpr OptionProperty kAudioClassificationProperties[] = {{0, "interval", 0}};
+inline constexpr OptionProperty kAudioClassificationProperties[] = {{0, "interval"}};
 inline constexpr OptionDescription kAudioClassification{
     .sensor = "LPE_P",
     .title = "audio classification",
@@ -17,9 +17,6 @@ inline constexpr OptionDescription kAudioClassification{
     .logTag = kLogTag,
     .unparsableMessage = "audio : invalid opton string %s, all set as default",
 };
-class OptionAudioClassification final : public OptionKind<OptionAudioClassification, kAudioClassification> {
- public:
-  int32_t interval() const { return settings[0]; }
-};
+class OptionAudioClassification final : public IntegerOption<OptionAudioClassification, kAudioClassification> {};
 
 }  // namespace senseloom

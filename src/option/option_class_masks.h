@@ -1,8 +1,8 @@
 #pragma once
 
-#include "option/described_option.h"
+#include "option/integer_option.h"
 
-// The option kinds that are a mask of wanted classes, or one sensitivity, and nothing peculiar in code.
+// The options that are a mask of wanted classes, or one sensitivity, and have no code of their own.
 namespace senseloom {
 
 inline constexpr OptionKey kGestureFlickKeys[] = {
@@ -13,7 +13,7 @@ inline constexpr OptionKey kGestureFlickKeys[] = {
      .merge = Merge::bitOr},
     {.name = "level", .range = {-5, 5}, .message = "gestureflick: invalid level value %d", .merge = Merge::minimum},
 };
-inline constexpr OptionProperty kGestureFlickProperties[] = {{61, "classMask", 0}, {62, "level", 1}};
+inline constexpr OptionProperty kGestureFlickProperties[] = {{61, "classMask"}, {62, "level"}};
 inline constexpr OptionDescription kGestureFlick{
     .sensor = "GSFLK",
     .title = "flick gesture",
@@ -22,10 +22,9 @@ inline constexpr OptionDescription kGestureFlick{
     .logTag = kLogTag,
     .unparsableMessage = "gestureflick: invalid opton string %s, all set as default",
 };
-class OptionGestureFlick final : public OptionKind<OptionGestureFlick, kGestureFlick> {
+class OptionGestureFlick final : public IntegerOption<OptionGestureFlick, kGestureFlick> {
  public:
-  int32_t classMask() const { return settings[0]; }
-  int32_t level() const { return settings[1]; }
+  int32_t classMask() const { return setting<kind.key("classMask")>(); }
 };
 
 inline constexpr OptionKey kShakingKeys[] = {
@@ -35,7 +34,7 @@ inline constexpr OptionKey kShakingKeys[] = {
      .message = "shaking: invalid clsmask value %d",  // "clsmask" is the wording of every kind, this one included
      .merge = Merge::maximum},
 };
-inline constexpr OptionProperty kShakingProperties[] = {{81, "sensitivity", 0}};
+inline constexpr OptionProperty kShakingProperties[] = {{81, "sensitivity"}};
 inline constexpr OptionDescription kShaking{
     .sensor = "SHAKI",
     .title = "shaking",
@@ -44,10 +43,7 @@ inline constexpr OptionDescription kShaking{
     .logTag = kLogTag,
     .unparsableMessage = "shaking: invalid opton string %s, all set as default",
 };
-class OptionShaking final : public OptionKind<OptionShaking, kShaking> {
- public:
-  int32_t sensitivity() const { return settings[0]; }
-};
+class OptionShaking final : public IntegerOption<OptionShaking, kShaking> {};
 
 inline constexpr OptionKey kInstantActivityKeys[] = {
     {.name = "classMask",
@@ -56,7 +52,7 @@ inline constexpr OptionKey kInstantActivityKeys[] = {
      .message = "instantactivity: invalid clsmask value %d",
      .merge = Merge::bitOr},
 };
-inline constexpr OptionProperty kInstantActivityProperties[] = {{151, "classMask", 0}};
+inline constexpr OptionProperty kInstantActivityProperties[] = {{151, "classMask"}};
 inline constexpr OptionDescription kInstantActivity{
     .sensor = "ISACT",
     .title = "instant activity",
@@ -64,14 +60,14 @@ inline constexpr OptionDescription kInstantActivity{
     .properties = kInstantActivityProperties,
     .logTag = "STY",  // this kind alone logs under a tag of its own, on purpose
     .unparsableMessage = "instantactivity: invalid opton string %s, all set as default",
-    // This kind accepts any string, on purpose: what can not be read, a null text included, changes nothing.
+    // This kind accepts any string, on purpose: what cannot be read, a null text included, changes nothing.
     .unparsableResult = 0,
     .nullIsUnparsable = true,
-    .note = "an option string that is no JSON is accepted and changes nothing",
+    .note = "an option string that is not JSON is accepted and changes nothing",
 };
-class OptionInstantActivity final : public OptionKind<OptionInstantActivity, kInstantActivity> {
+class OptionInstantActivity final : public IntegerOption<OptionInstantActivity, kInstantActivity> {
  public:
-  int32_t classMask() const { return settings[0]; }
+  int32_t classMask() const { return setting<kind.key("classMask")>(); }
 };
 
 inline constexpr OptionKey kGestureHMMKeys[] = {
@@ -89,9 +85,9 @@ inline constexpr OptionDescription kGestureHMM{
     .logTag = kLogTag,
     .unparsableMessage = "gesture hmm: invalid opton string %s, all set as default",
 };
-class OptionGestureHMM final : public OptionKind<OptionGestureHMM, kGestureHMM> {
+class OptionGestureHMM final : public IntegerOption<OptionGestureHMM, kGestureHMM> {
  public:
-  int32_t classMask() const { return settings[0]; }
+  int32_t classMask() const { return setting<kind.key("classMask")>(); }
 };
 
 inline constexpr OptionKey kGestureEartouchKeys[] = {
@@ -101,7 +97,7 @@ inline constexpr OptionKey kGestureEartouchKeys[] = {
      .message = "gesture eartouch: invalid clsmask value %d",
      .merge = Merge::bitOr},
 };
-inline constexpr OptionProperty kGestureEartouchProperties[] = {{161, "classMask", 0}};
+inline constexpr OptionProperty kGestureEartouchProperties[] = {{161, "classMask"}};
 inline constexpr OptionDescription kGestureEartouch{
     .sensor = "GSETH",
     .title = "ear touch",
@@ -110,9 +106,9 @@ inline constexpr OptionDescription kGestureEartouch{
     .logTag = kLogTag,
     .unparsableMessage = "gesture eartouch: invalid opton string %s, all set as default",
 };
-class OptionGestureEartouch final : public OptionKind<OptionGestureEartouch, kGestureEartouch> {
+class OptionGestureEartouch final : public IntegerOption<OptionGestureEartouch, kGestureEartouch> {
  public:
-  int32_t classMask() const { return settings[0]; }
+  int32_t classMask() const { return setting<kind.key("classMask")>(); }
 };
 
 inline constexpr OptionKey kLiftKeys[] = {
@@ -122,7 +118,7 @@ inline constexpr OptionKey kLiftKeys[] = {
      .message = "tapping: invalid clsmask value %d",  // shares the tapping message, on purpose
      .merge = Merge::bitOr},
 };
-inline constexpr OptionProperty kLiftProperties[] = {{201, "classMask", 0}};
+inline constexpr OptionProperty kLiftProperties[] = {{201, "classMask"}};
 inline constexpr OptionDescription kLift{
     .sensor = "LIFT",
     .title = "lift",
@@ -131,9 +127,6 @@ inline constexpr OptionDescription kLift{
     .logTag = kLogTag,
     .note = "the mask is always 3, and every option string is logged as holding a bad one",
 };
-class OptionLift final : public OptionKind<OptionLift, kLift> {
- public:
-  int32_t classMask() const { return settings[0]; }
-};
+class OptionLift final : public IntegerOption<OptionLift, kLift> {};
 
 }  // namespace senseloom

@@ -1,9 +1,11 @@
 #pragma once
 
 #include <algorithm>
+#include <cstddef>
 #include <cstdint>
 #include <limits>
 #include <span>
+#include <string_view>
 
 // What is data about an option kind. Parsing, merging and rendering read it, the command-line tool prints it, and one
 // contract test checks every kind against it.
@@ -70,13 +72,11 @@ struct OptionKey {
   const char* note = nullptr;  // what the kind's own code adds to the above, for the tool to print
 };
 
-// One entry of a property list.
+// One entry of a property list. It shows the setting of the key of its name; when there is none, the kind's own code
+// makes its value.
 struct OptionProperty {
-  static constexpr int kComputed = -1;
-
   int32_t id;
   const char* name;
-  int key;  // index of the key whose setting it shows; kComputed: the kind's own code makes the value
 };
 
 struct OptionDescription {
@@ -86,10 +86,23 @@ struct OptionDescription {
   std::span<const char* const> stringKeys = {};  // keys with string values, which the kind's own code reads
   std::span<const OptionProperty> properties;
   const char* logTag;
-  const char* unparsableMessage = nullptr;  // format of the log line about text that is no JSON, its one %s; null: none
-  int unparsableResult = -1;
-  bool nullIsUnparsable = false;  // a null text is logged as text that is no JSON is, and gives the same result
+  const char* unparsableMessage =
+      nullptr;                    // format of the log line about text that is not JSON, its one %s; null: none
+  int unparsableResult = -1;      // of parsing such text, or a null text
+  bool nullIsUnparsable = false;  // a null text is logged as text that is not JSON
   const char* note = nullptr;     // what is particular about the whole option, for the tool to print
+
+  // The index of the key of that name; the number of keys when there is none.
+  constexpr size_t findKey(std::string_view name) const {
+    size_t i = 0;
+    while (i < keys.size() && keys[i].name != name) ++i;
+    return i;
+  }
+  // The same for a constant name; does not compile when there is no such key.
+  constexpr size_t key(std::string_view name) const {
+    const size_t found = findKey(name);
+    return found < keys.size() ? found : throw "no such key";
+  }
 };
 
 }  // namespace senseloom

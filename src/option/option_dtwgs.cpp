@@ -7,15 +7,19 @@
 #include <cstring>
 
 #include "bytes.h"
-#include "option/described_option.h"
+#include "option/integer_option.h"
 
 namespace senseloom {
 namespace {
 
-const OptionKey& kModeKey = kDTWGSKeys[0];
-const OptionKey& kMaskKey = kDTWGSKeys[1];
-const OptionKey& kLevelKey = kDTWGSKeys[2];
-const OptionKey& kIndexKey = kDTWGSKeys[3];
+constexpr const OptionKey& kModeKey = kDTWGS.keys[kDTWGS.key("mode")];
+constexpr const OptionKey& kMaskKey = kDTWGS.keys[kDTWGS.key("classMask")];
+constexpr const OptionKey& kLevelKey = kDTWGS.keys[kDTWGS.key("level")];
+constexpr const OptionKey& kIndexKey = kDTWGS.keys[kDTWGS.key("index")];
+
+int32_t read(const json_t* root, const OptionKey& key) {
+  return readInteger(root, key.name, key.defaultValue);
+}
 
 // Only 0-9 and a-f give their value; anything else, uppercase included, gives a wrong one. Templates are written by the
 // enrolling side, which uses lowercase.
@@ -71,18 +75,18 @@ int OptionDTWGS::parse(const char* text) {
   }
   if (!templatesStored) return -1;
 
-  const Settings read = {
-      .mode = readInteger(root.get(), kModeKey.name, kModeKey.defaultValue),
-      .classMask = readInteger(root.get(), kMaskKey.name, kMaskKey.defaultValue),
-      .level = readInteger(root.get(), kLevelKey.name, kLevelKey.defaultValue),
-      .index = readInteger(root.get(), kIndexKey.name, kIndexKey.defaultValue),
+  const Settings given = {
+      .mode = read(root.get(), kModeKey),
+      .classMask = read(root.get(), kMaskKey),
+      .level = read(root.get(), kLevelKey),
+      .index = read(root.get(), kIndexKey),
   };
-  if (read.mode != kEnroll && read.mode != kMatch) return refuse(kModeKey, read.mode);
-  if (read.mode == kMatch && !kMaskKey.range.contains(read.classMask)) return refuse(kMaskKey, read.classMask);
-  if (read.mode == kMatch && !kLevelKey.range.contains(read.level)) return refuse(kLevelKey, read.level);
-  if (read.mode == kEnroll && !kIndexKey.range.contains(read.index)) return refuse(kIndexKey, read.index);
+  if (given.mode != kEnroll && given.mode != kMatch) return refuse(kModeKey, given.mode);
+  if (given.mode == kMatch && !kMaskKey.range.contains(given.classMask)) return refuse(kMaskKey, given.classMask);
+  if (given.mode == kMatch && !kLevelKey.range.contains(given.level)) return refuse(kLevelKey, given.level);
+  if (given.mode == kEnroll && !kIndexKey.range.contains(given.index)) return refuse(kIndexKey, given.index);
 
-  settings = read;
+  settings = given;
   levelMirror = 0;
   templateNumberMirrors = {};
   bit0Count = bit1Count = 0;
@@ -91,55 +95,59 @@ int OptionDTWGS::parse(const char* text) {
 }
 
 void OptionDTWGS::merge(const Option& other) {
-  const Settings& that = static_cast<const OptionDTWGS&>(other).settings;
-  settings.classMask |= that.classMask;
-  settings.level = std::min(settings.level, that.level);
-  if (bitAt(that.mode, 0) && ++bit0Count > 1) valid = false;
-  if (bitAt(that.mode, 1) && ++bit1Count > 1) valid = false;
-  settings.mode |= that.mode;
+  const Settings& theirs = static_cast<const OptionDTWGS&>(other).settings;
+  settings.classMask |= theirs.classMask;
+  settings.level = std::min(settings.level, theirs.level);
+  if (bitAt(theirs.mode, 0) && ++bit0Count > 1) valid = false;
+  if (bitAt(theirs.mode, 1) && ++bit1Count > 1) valid = false;
+  settings.mode |= theirs.mode;
 }
 
 std::unique_ptr<Option> OptionDTWGS::clone() const {
   auto copy = std::make_unique<OptionDTWGS>();
   copy->settings = settings;
-  copy->settings.index = 0;  // which slot a session enrolls is its own affair and never merged, on purpose
+  copy->settings.index = 0;  // never merged, on purpose: which slot a session enrolls concerns that session alone
   return copy;
 }
 
 void OptionDTWGS::setProperty(ctx_option_t** out) {
-  if (out == nullptr) return;
-  *out = nullptr;
+  if (out != nullptr) *out = makeList();
+}
+
+ctx_option_t* OptionDTWGS::makeList() {
   if (!valid) {
     __android_log_print(ANDROID_LOG_DEBUG, kLogTag, "option invalid");
-    return;
+    return nullptr;
   }
   switch (settings.mode) {
     case kEnroll:
     case 2:  // no string can set it, but it is another way of enrolling
-      *out = newOption(0);
-      return;
+      return newOption(0);
     case kMatch:
-      break;
+      return makeMatchingList();
     default:
       __android_log_print(ANDROID_LOG_DEBUG, kLogTag, "option mode incompatible: %d", settings.mode);
-      return;
+      return nullptr;
   }
+}
 
-  const auto wanted = [this](int slot) {
-    return bitAt(settings.classMask, slot) && tempInst.slots[static_cast<size_t>(slot)].templateLength > 0;
+ctx_option_t* OptionDTWGS::makeMatchingList() {
+  const auto isListed = [this](size_t slot) {
+    return bitAt(settings.classMask, static_cast<int32_t>(slot)) && tempInst.slots[slot].templateLength > 0;
   };
-  *out = newOption(1 + (wanted(0) ? 2 : 0) + (wanted(1) ? 2 : 0));
+  ctx_option_t* list = newOption(1 + (isListed(0) ? 2 : 0) + (isListed(1) ? 2 : 0));
   levelMirror = settings.level;
   int entry = 0;
-  fillOptionAt(*out, entry++, 121, &levelMirror, sizeof levelMirror);
-  for (int i = 0; i < 2; ++i) {
-    if (!wanted(i)) continue;
-    auto& slot = tempInst.slots[static_cast<size_t>(i)];
-    int32_t& number = templateNumberMirrors[static_cast<size_t>(i)];
-    number = i;
-    fillOptionAt(*out, entry++, 122, &number, sizeof number);
-    fillOptionAt(*out, entry++, 123, slot.templateData.data(), slot.templateLength);
+  fillOptionAt(list, entry++, 121, &levelMirror, sizeof levelMirror);
+  for (size_t slot = 0; slot < tempInst.slots.size(); ++slot) {
+    if (!isListed(slot)) continue;
+    templateNumberMirrors[slot] = static_cast<int32_t>(slot);
+    fillOptionAt(list, entry++, 122, &templateNumberMirrors[slot], sizeof templateNumberMirrors[slot]);
+    // Points into the store, so that its bytes change when any later option string brings a template.
+    auto& stored = tempInst.slots[slot];
+    fillOptionAt(list, entry++, 123, stored.templateData.data(), stored.templateLength);
   }
+  return list;
 }
 
 }  // namespace senseloom

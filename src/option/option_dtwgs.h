@@ -36,9 +36,9 @@ inline constexpr OptionKey kDTWGSKeys[] = {
 };
 inline constexpr const char* kDTWGSStringKeys[] = {"template1", "template2"};
 inline constexpr OptionProperty kDTWGSProperties[] = {
-    {121, "level", OptionProperty::kComputed},
-    {122, "templateNumber", OptionProperty::kComputed},
-    {123, "templateData", OptionProperty::kComputed},
+    {121, "level"},
+    {122, "templateNumber"},
+    {123, "templateData"},
 };
 inline constexpr OptionDescription kDTWGS{
     .sensor = "DTWGS",
@@ -81,10 +81,7 @@ class OptionDTWGS : public Option {
   std::unique_ptr<Option> clone() const override;
   void setProperty(ctx_option_t** out) override;
 
-  int32_t mode() const { return settings.mode; }
   int32_t classMask() const { return settings.classMask; }
-  int32_t level() const { return settings.level; }
-  int32_t index() const { return settings.index; }
 
  protected:
   struct Settings {
@@ -96,6 +93,10 @@ class OptionDTWGS : public Option {
   Settings settings;
 
  private:
+  // The list for the settings' mode; null, with the reason logged, when sessions want what excludes each other.
+  ctx_option_t* makeList();
+  ctx_option_t* makeMatchingList();
+
   // The state of a merge.
   int32_t bit0Count = 0;  // merged options whose mode has bit 0 (enroll)
   int32_t bit1Count = 0;

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "option/described_option.h"
+#include "option/integer_option.h"
 
 namespace senseloom {
 
@@ -19,8 +19,8 @@ inline constexpr OptionKey kPDRKeys[] = {
     {.name = "6DOF", .defaultValue = 2, .range = {0, 1}, .message = "PDR: invalid 6DOF value %d"},
 };
 inline constexpr OptionProperty kPDRProperties[] = {
-    {181, "userHeight", 0}, {182, "floorHeight", 1}, {183, "initX", 2}, {184, "initY", 3},
-    {185, "initFloor", 4},  {186, "N", 5},           {187, "6DOF", 6},
+    {181, "userHeight"}, {182, "floorHeight"}, {183, "initX"}, {184, "initY"},
+    {185, "initFloor"},  {186, "N"},           {187, "6DOF"},
 };
 inline constexpr OptionDescription kPDR{
     .sensor = "PDR",
@@ -29,15 +29,9 @@ inline constexpr OptionDescription kPDR{
     .properties = kPDRProperties,
     .logTag = kLogTag,
 };
-class OptionPDR final : public OptionKind<OptionPDR, kPDR> {
+class OptionPDR final : public IntegerOption<OptionPDR, kPDR> {
  public:
-  int32_t userHeight() const { return settings[0]; }
-  int32_t floorHeight() const { return settings[1]; }
-  int32_t initX() const { return settings[2]; }
-  int32_t initY() const { return settings[3]; }
-  int32_t initFloor() const { return settings[4]; }
-  int32_t N() const { return settings[5]; }
-  int32_t sixDOF() const { return settings[6]; }
+  int32_t N() const { return setting<kind.key("N")>(); }
 };
 
 }  // namespace senseloom

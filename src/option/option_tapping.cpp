@@ -2,10 +2,11 @@
 
 namespace senseloom {
 
-void OptionTapping::adjust(const Values& /*read*/) {
+void OptionTapping::adjust(const Settings& /*given*/) {
   // A bad level is kept and empties the class mask instead, on purpose: such a client gets no taps at all, unlike a
   // flick client, whose bad level becomes 0.
-  if (!kind.keys[1].range.contains(level())) settings[0] = 0;
+  constexpr size_t kLevel = kind.key("level");
+  if (!kind.keys[kLevel].range.contains(setting<kLevel>())) set<kind.key("classMask")>(0);
 }
 
 }  // namespace senseloom

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "option/described_option.h"
+#include "option/integer_option.h"
 
 namespace senseloom {
 
@@ -17,7 +17,7 @@ inline constexpr OptionKey kTappingKeys[] = {
      .merge = Merge::minimum,
      .note = "a level out of range sets \"classMask\" to 0"},
 };
-inline constexpr OptionProperty kTappingProperties[] = {{101, "classMask", 0}, {102, "level", 1}};
+inline constexpr OptionProperty kTappingProperties[] = {{101, "classMask"}, {102, "level"}};
 inline constexpr OptionDescription kTapping{
     .sensor = "STAP",
     .title = "tapping",
@@ -26,13 +26,12 @@ inline constexpr OptionDescription kTapping{
     .logTag = kLogTag,
 };
 
-class OptionTapping final : public OptionKind<OptionTapping, kTapping> {
+class OptionTapping final : public IntegerOption<OptionTapping, kTapping> {
  public:
-  int32_t classMask() const { return settings[0]; }
-  int32_t level() const { return settings[1]; }
+  int32_t classMask() const { return setting<kind.key("classMask")>(); }
 
  private:
-  void adjust(const Values& read) override;
+  void adjust(const Settings& given) override;
 };
 
 }  // namespace senseloom

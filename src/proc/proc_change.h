@@ -1,27 +1,52 @@
 #pragma once
 
-#include "proc/proc.h"
+#include <array>
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
 
 namespace senseloom {
 
-// Lets a complete batch through only when it differs from what was last let through; drops it otherwise. The first
-// batch always passes. What is remembered survives reset() and goes only with restart().
-class ProcChange final : public ProcOnTop {
+// Lets a complete batch through only when it differs from what was last let through, by kEqual(element, last); drops it
+// otherwise. The first batch always passes. What is remembered survives reset().
+template <class Previous, bool (*kEqual)(const void*, const void*)>
+class ProcChange {
  public:
-  explicit ProcChange(std::unique_ptr<Proc> previous)
-      : ProcOnTop(std::move(previous)), last(new uint8_t[static_cast<size_t>(elemSize)]) {}
+  static constexpr size_t kElementSize = Previous::kElementSize;
 
-  void restart() override {
-    remembers = false;
-    ProcOnTop::restart();
+  ProcChange() = default;
+  explicit ProcChange(Previous previous) : prev(previous) {}
+
+  bool accept(const void* data, int count) {
+    if (!prev.accept(data, count)) return false;
+    if (remembers && !differs()) {
+      reset();
+      return false;
+    }
+    // The batch's last element is remembered, not the one that differed, on purpose: A B A after A is let through, and
+    // A stays remembered.
+    std::memcpy(last.data(), buffer() + static_cast<size_t>(length() - 1) * kElementSize, kElementSize);
+    remembers = true;
+    return true;
   }
 
- private:
-  bool process() override;
-  bool differs() const;
+  uint8_t* buffer() { return prev.buffer(); }
+  int length() const { return prev.length(); }
+  int bufferLength() const { return prev.bufferLength(); }
+  void reset() { prev.reset(); }
 
-  const std::unique_ptr<uint8_t[]> last;  // the last element of the last batch let through
-  bool remembers = false;                 // whether there was one
+ private:
+  bool differs() {
+    const uint8_t* element = buffer();
+    for (int left = length(); left > 0; --left, element += kElementSize) {
+      if (!kEqual(element, last.data())) return true;
+    }
+    return false;
+  }
+
+  Previous prev;
+  std::array<uint8_t, kElementSize> last{};  // the last element of the last batch let through
+  bool remembers = false;                    // whether there was one
 };
 
 }  // namespace senseloom

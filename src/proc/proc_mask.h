@@ -1,22 +1,34 @@
 #pragma once
 
-#include "proc/proc.h"
+#include <cstddef>
+#include <cstdint>
 
 namespace senseloom {
 
-// Rewrites every element of a complete batch in place, in the buffer of the stage before it.
-class ProcMask final : public ProcOnTop {
+// Rewrites every element of a complete batch in place, by kMask(element, maskArg).
+template <class Previous, void (*kMask)(void*, int)>
+class ProcMask {
  public:
-  using MaskFunc = void (*)(void* element, int arg);
+  static constexpr size_t kElementSize = Previous::kElementSize;
 
-  ProcMask(std::unique_ptr<Proc> previous, MaskFunc mask, int arg)
-      : ProcOnTop(std::move(previous)), maskFunc(mask), maskArg(arg) {}
+  ProcMask() = default;
+  ProcMask(Previous previous, int arg) : prev(previous), maskArg(arg) {}
+
+  bool accept(const void* data, int count) {
+    if (!prev.accept(data, count)) return false;
+    uint8_t* element = buffer();
+    for (int left = length(); left > 0; --left, element += kElementSize) kMask(element, maskArg);
+    return true;
+  }
+
+  uint8_t* buffer() { return prev.buffer(); }
+  int length() const { return prev.length(); }
+  int bufferLength() const { return prev.bufferLength(); }
+  void reset() { prev.reset(); }
 
  private:
-  bool process() override;
-
-  const MaskFunc maskFunc;
-  const int maskArg;
+  Previous prev;
+  int maskArg = 0;
 };
 
 }  // namespace senseloom

@@ -1,33 +1,39 @@
 #pragma once
 
-#include "proc/proc.h"
+#include <array>
+#include <cstddef>
+#include <cstdint>
 
 namespace senseloom {
 
-// Reduces each complete batch of the stage before it to one element.
-class ProcMixer : public ProcOnTop {
+// Reduces each complete batch of the stage before it to one element: mix(previous stage, result) writes it.
+template <class Previous, class Mix>
+class ProcMixer {
  public:
-  // The result is made as soon as the batch before it is complete, and goes with that.
-  int length() const override { return prev->length() == prev->bufferLength() ? 1 : 0; }
+  static constexpr size_t kElementSize = Previous::kElementSize;
 
- protected:
-  explicit ProcMixer(std::unique_ptr<Proc> previous)
-      : ProcMixer(std::move(previous), Result(new uint8_t[static_cast<size_t>(previous->elemSize)])) {}
+  ProcMixer() = default;
+  ProcMixer(Previous previous, Mix how) : prev(previous), mix(how) {}
 
-  // Writes the element that stands for the complete batch of `prev` to buffer().
-  virtual void mix() = 0;
-
- private:
-  using Result = std::unique_ptr<uint8_t[]>;
-  ProcMixer(std::unique_ptr<Proc>&& previous, Result memory)
-      : ProcOnTop(std::move(previous), memory.get(), 1), result(std::move(memory)) {}
-
-  bool process() final {
-    mix();
-    return true;
+  bool accept(const void* data, int count) {
+    if (mixed || !prev.accept(data, count)) return false;
+    mix(prev, result.data());
+    return mixed = true;
   }
 
-  const Result result;
+  uint8_t* buffer() { return result.data(); }
+  int length() const { return mixed ? 1 : 0; }
+  int bufferLength() const { return 1; }
+  void reset() {
+    prev.reset();
+    mixed = false;
+  }
+
+ private:
+  Previous prev;
+  Mix mix;
+  std::array<uint8_t, kElementSize> result{};
+  bool mixed = false;  // whether `result` holds the element of a batch
 };
 
 }  // namespace senseloom

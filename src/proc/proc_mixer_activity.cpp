@@ -1,52 +1,62 @@
 #include "proc/proc_mixer_activity.h"
 
 #include <array>
+#include <cstddef>
 
-#include "proc/activity_record.h"
+// clang before 13 does not know the pragma.
+#if defined(__clang__) && __clang_major__ < 13
+#define SENSELOOM_UNROLL
+#else
+#define SENSELOOM_UNROLL _Pragma("GCC unroll 8")
+#endif
 
 namespace senseloom {
 namespace {
 
 constexpr uint32_t kFirstWeight = 1024;
-constexpr size_t kClassIds = 16;
-constexpr size_t kVotedClasses = 8;
-constexpr uint16_t kNoMajority = 6;  // the class that stands for "no class has the majority", fixed on purpose
+constexpr size_t kGrowingShifts = 11;  // a larger shift leaves nothing to add to the first weight
+constexpr uint16_t kNoMajority = 6;    // the class that stands for "no class has the majority", fixed on purpose
+
+// The weights of a batch by shift and position. They wrap around in 32 bits: with weightVar 0 the weight of the 22nd
+// decision already does.
+using Weights = std::array<uint32_t, ActivityVote::kMostDecisions>;
+constexpr auto kWeights = [] {
+  std::array<Weights, kGrowingShifts> all{};
+  for (size_t shift = 0; shift < kGrowingShifts; ++shift) {
+    uint32_t weight = kFirstWeight;
+    for (uint32_t& place : all[shift]) {
+      place = weight;
+      weight += static_cast<uint32_t>(static_cast<int32_t>(weight) >> shift);
+    }
+  }
+  return all;
+}();
 
 }  // namespace
 
-void ProcMixerActivity::mix() {
-  if (prev->bufferLength() != 1) return vote();
-  // What clients get who ask for nothing else: no vote to take, it has the majority.
-  const auto only = ActivityRecord::at(prev->buffer());
-  only.withClass(only.classId() < kVotedClasses ? only.classId() : 0).storeAt(buffer());
-}
-
-void ProcMixerActivity::vote() {
-  const uint8_t* batch = prev->buffer();
-  const int count = prev->bufferLength();
-  // Weights and sums wrap around in 32 bits: with weightVar 0 the weight of the 22nd record already does.
-  std::array<uint32_t, kClassIds> scores{};
-  uint32_t total = 0;
-  uint32_t weight = kFirstWeight;
-  if (weight >> weightShift == 0) {  // all weigh the same
-#pragma GCC unroll 8
-    for (int i = 0; i < count; ++i) scores[ActivityRecord::at(batch + i * ActivityRecord::kSize).classId()] += weight;
-    total = static_cast<uint32_t>(count) * weight;
+uint16_t ActivityVote::vote(const uint8_t* batch, int count) const {
+  std::array<uint32_t, ActivityDecision::kClassIds> scores{};
+  const auto add = [&](int i, uint32_t weight) {
+    scores[ActivityDecision::at(batch + static_cast<size_t>(i) * ActivityDecision::kSize).classId()] += weight;
+  };
+  if (weightShift >= kGrowingShifts) {  // all weigh the same
+    SENSELOOM_UNROLL
+    for (int i = 0; i < count; ++i) add(i, kFirstWeight);
   } else {
-    for (int i = 0; i < count; ++i) {
-      scores[ActivityRecord::at(batch + i * ActivityRecord::kSize).classId()] += weight;
-      total += weight;
-      weight += static_cast<uint32_t>(static_cast<int32_t>(weight) >> weightShift);
-    }
+    const Weights& weights = kWeights[weightShift];
+    SENSELOOM_UNROLL
+    for (int i = 0; i < count; ++i) add(i, weights[static_cast<size_t>(i)]);
   }
-  for (size_t id = kVotedClasses; id < kClassIds; ++id) scores[0] += scores[id];  // unknown classes count as class 0
+  for (size_t id = kVotedClasses; id < scores.size(); ++id) scores[0] += scores[id];
 
   uint16_t winner = 0;  // of several with the same score, the lowest id
+  uint32_t total = scores[0];
   for (uint16_t id = 1; id < kVotedClasses; ++id) {
+    total += scores[id];
     if (static_cast<int32_t>(scores[id]) > static_cast<int32_t>(scores[winner])) winner = id;
   }
-  const bool majority = static_cast<int32_t>(scores[winner]) > static_cast<int32_t>(total) >> 1;
-  ActivityRecord::at(batch).withClass(majority ? winner : kNoMajority).storeAt(buffer());
+  const bool hasMajority = static_cast<int32_t>(scores[winner]) > static_cast<int32_t>(total) >> 1;
+  return hasMajority ? winner : kNoMajority;
 }
 
 }  // namespace senseloom

@@ -1,16 +1,24 @@
 #pragma once
 
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+
 #include "proc/proc_mixer.h"
 
 namespace senseloom {
 
-// Reduces a batch of 32-bit counts to its most recent one. No session builds it.
-class ProcMixerPedo final : public ProcMixer {
- public:
-  explicit ProcMixerPedo(std::unique_ptr<Proc> previous) : ProcMixer(std::move(previous)) {}
-
- private:
-  void mix() override;
+// The most recent value of a batch of 32-bit counts.
+struct LatestCount {
+  template <class Previous>
+  void operator()(const Previous& previous, uint8_t* result) const {
+    std::memcpy(result, previous.buffer() + static_cast<size_t>(previous.length() - 1) * sizeof(int32_t),
+                sizeof(int32_t));
+  }
 };
+
+// No session builds it.
+template <class Previous>
+using ProcMixerPedo = ProcMixer<Previous, LatestCount>;
 
 }  // namespace senseloom

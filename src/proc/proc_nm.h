@@ -1,38 +1,54 @@
 #pragma once
 
-#include <memory>
+#include <algorithm>
+#include <cstddef>
+#include <cstdint>
+#include <span>
 
-#include "proc/proc.h"
+#include "bytes.h"
 
 namespace senseloom {
 
-// Gathers batches of a fixed number of elements, in the order in which they arrive.
-class ProcNM final : public ProcFirst {
+// A processing chain turns elements, blocks of a few bytes, into results. Its first stage, this one, gathers them into
+// batches of a fixed number; every other stage holds the stage before it and acts on a batch once it is complete. The
+// owner of a chain talks to the last stage alone:
+//
+//   if (last.accept(data, count)) { use length() elements at buffer(); last.reset(); }
+//
+// accept() offers `count` elements that lie back to back at `data` and returns whether a result is ready now; null data
+// and a negative count change nothing. A chain with a result takes nothing more until it is reset. Stages know how
+// large an element is; what it means is known to the functions that they are made with. The type of a chain spells its
+// stages, so the compiler sees the whole way of an element.
+template <size_t kSize>
+class ProcNM {
  public:
-  using CheckSeqFunc = int (*)(const void*);
+  static constexpr size_t kElementSize = kSize;
 
-  // A batch of 0 or fewer elements holds nothing and refuses every offer. `checkSeq` tells an element's sequence number
-  // and may be null.
-  ProcNM(int elementSize, EqualFunc equal, CheckSeqFunc checkSeq, int bufferLength);
-  ProcNM(int elementSize, EqualFunc equal, int bufferLength) : ProcNM(elementSize, equal, nullptr, bufferLength) {}
+  // A stage that holds nothing and refuses every offer.
+  ProcNM() = default;
+  // The batch is as large as the memory, which has to outlive the stage.
+  explicit ProcNM(std::span<uint8_t> memory)
+      : batch(memory.data()), capacity(static_cast<int>(memory.size() / kSize)) {}
 
-  int length() const override { return filled; }
+  // Elements beyond the room of the batch are dropped and not kept for the next one, on purpose.
+  bool accept(const void* data, int count) {
+    const int taken = std::min(count, capacity - filled);
+    if (taken <= 0 || data == nullptr) return false;
+    uint8_t* const end = batch + static_cast<size_t>(filled) * kSize;
+    filled += taken;
+    copyBytes<kSize>(end, data, static_cast<size_t>(taken) * kSize);
+    return filled == capacity;
+  }
 
-  // Carried for the owner of the chain. Gathering never calls it: gaps and repeats in the sequence are taken as they
-  // come.
-  const CheckSeqFunc checkSeqFunc;
+  uint8_t* buffer() const { return batch; }
+  int length() const { return filled; }
+  int bufferLength() const { return capacity; }  // elements of a complete batch
+  void reset() { filled = 0; }
 
  private:
-  using Batch = std::unique_ptr<uint8_t[]>;
-  ProcNM(int elementSize, EqualFunc equal, CheckSeqFunc checkSeq, int bufferLength, Batch memory)
-      : ProcFirst(elementSize, equal, memory.get(), bufferLength), checkSeqFunc(checkSeq), batch(std::move(memory)) {}
-
-  // Elements beyond the room of the batch are dropped and not kept for the next batch, on purpose.
-  bool gather(const void* data, int count) override;
-  void drop() override { filled = 0; }
-
+  uint8_t* batch = nullptr;
+  int capacity = 0;
   int filled = 0;
-  const Batch batch;
 };
 
 }  // namespace senseloom

@@ -1,29 +1,30 @@
 #pragma once
 
+#include "audio/audio_hal.h"
 #include "session/context_sensor.h"
-#include "session/session_kinds.h"
+#include "session/session_activity.h"
+#include "session/session_filters.h"
+#include "session/session_gesture_hmm.h"
+#include "session/session_pdr.h"
+#include "session/session_step_count.h"
 
 namespace senseloom {
 
-template <class SessionKind>
-class ContextSensorOf : public ContextSensor {
+// Audio classification comes from the platform's audio hardware, whose aware session runs while there are clients.
+class AwareSensor : public ContextSensor {
  public:
-  std::unique_ptr<Session> createSession() const override { return std::make_unique<SessionKind>(); }
-  bool onStart() override { return true; }
-  bool onStop() override { return true; }
+  bool onStart() override { return activateAudio(); }
+  bool onStop() override { return deactivateAudio(); }
 };
 
-// Audio classification comes from the platform's audio hardware, whose aware session runs while there are clients.
-template <>
-inline bool ContextSensorOf<SessionAudioClassification>::onStart() {
-  return audio_hal_activate();
-}
-template <>
-inline bool ContextSensorOf<SessionAudioClassification>::onStop() {
-  return audio_hal_deactivate();
-}
+template <class SessionClass, class Base>
+class ContextSensorOf final : public Base {
+ public:
+  Session* createSession() const override { return new SessionClass; }
+};
 
-#define SENSOR_KIND(Kind) using ContextSensor##Kind = ContextSensorOf<Session##Kind>;
+#define SENSOR_KIND(SensorClass, SessionClass, OptionClass, BaseClass) \
+  using SensorClass = ContextSensorOf<SessionClass, BaseClass>;
 #include "sensor_kinds.def"
 #undef SENSOR_KIND
 

@@ -10,7 +10,7 @@ void negotiate(ContextSensor& sensor, std::unique_ptr<Option> merged, ctx_option
   for (const Session* session : sensor.sessions) {
     __android_log_print(ANDROID_LOG_INFO, "Libsl", "The %d of %d session of sensor %s has %p option!\n", index++, count,
                         session->name, static_cast<const void*>(session));
-    merged->merge(session->ownOption());
+    merged->merge(*session->option);
   }
   sensor.mergedOption = std::move(merged);
   sensor.mergedOption->setProperty(out);

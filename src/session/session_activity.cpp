@@ -3,66 +3,40 @@
 #include <algorithm>
 #include <cstring>
 
-#include "proc/activity_record.h"
-#include "proc/proc_change.h"
-#include "proc/proc_mask.h"
-#include "proc/proc_mixer_activity.h"
-#include "proc/proc_nm.h"
-#include "session/context_sensor.h"  // the one look upward: for the options of the other sessions, merged
+#include "bytes.h"
+#include "session/context_sensor.h"
 #include "session/record.h"
 
 namespace senseloom {
 
-bool _activity_equal_func(const void* a, const void* b) {
-  if (a == nullptr || b == nullptr) return a == b;
-  return ActivityRecord::at(a).classId() == ActivityRecord::at(b).classId();
-}
-
-void _activity_mask_func(void* item, int mask) {
-  if (item == nullptr) return;
-  const auto record = ActivityRecord::at(item);
-  if (!bitAt(mask, record.classId())) record.withClass(0).storeAt(item);
-}
-
-int _activity_check_seq_func(const void* item) {
-  return item == nullptr ? -1 : ActivityRecord::at(item).sequence();
-}
-
-std::unique_ptr<Proc> SessionActivity::makeChain(const ChainPlan& plan) {
-  std::unique_ptr<Proc> chain =
-      std::make_unique<ProcNM>(ActivityRecord::kSize, _activity_equal_func, _activity_check_seq_func, plan.batch);
-  // The vote counts unmasked classes: a winner that the client did not ask for is delivered as class 0. Change is seen
-  // last, so that a client hears nothing of changes among classes that it did not ask for.
-  if (plan.summary != 0) chain = std::make_unique<ProcMixerActivity>(std::move(chain), plan.weightVar);
-  chain = std::make_unique<ProcMask>(std::move(chain), _activity_mask_func, plan.classMask);
-  if (plan.mode == 1) chain = std::make_unique<ProcChange>(std::move(chain));
-  return chain;
-}
-
-int SessionActivity::buildProc() try {
-  const auto* sensor = static_cast<const ContextSensor*>(getSensor(name));
-  if (sensor == nullptr || sensor->mergedOption == nullptr) return -1;
-  const auto& wanted = static_cast<const OptionActivity&>(*option);
-  const auto& merged = static_cast<const OptionActivity&>(*sensor->mergedOption);
-
-  const auto exponent = static_cast<uint32_t>(wanted.logN() - merged.logM()) & 31U;
-  const ChainPlan wantedPlan = {
-      .batch = static_cast<int>(uint32_t{1} << exponent),
-      .summary = wanted.summary(),
-      .weightVar = wanted.weightVar(),
-      .classMask = wanted.classMask(),
-      .mode = wanted.mode(),
-  };
-  // Most negotiations concern other sessions and leave this one's chain as it was, but for starting over.
-  if (proc != nullptr && wantedPlan == plan) {
-    proc->restart();
-    return 0;
+SessionActivity::Chain SessionActivity::makeChain(std::span<uint8_t> batch) const {
+  const Batch first(batch);
+  const bool onChange = wanted.mode() == 1;
+  if (wanted.summary() == 0) {
+    const Decisions decisions(first, wanted.classMask());
+    if (onChange) return ProcChange<Decisions, _activity_equal_func>(decisions);
+    return decisions;
   }
-  proc = makeChain(wantedPlan);
-  plan = wantedPlan;
+  const Votes votes({first, ActivityVote(wanted.weightVar())}, wanted.classMask());
+  if (onChange) return ProcChange<Votes, _activity_equal_func>(votes);
+  return votes;
+}
+
+int SessionActivity::buildProc() {
+  const ContextSensor* sensor = findSensor(name);
+  if (sensor == nullptr || sensor->mergedOption == nullptr) return -1;
+  const auto& merged = static_cast<const OptionActivity&>(*sensor->mergedOption);
+  const auto exponent = static_cast<uint32_t>(wanted.logN() - merged.logM()) & 31U;
+  const size_t size = ActivityDecision::kSize << exponent;
+  if (size > memorySize) {
+    auto* larger = new (std::nothrow) uint8_t[size];
+    if (larger == nullptr) return -1;  // the old chain stays
+    memory.reset(larger);
+    memorySize = size;
+  }
+  chain = makeChain({memory.get(), size});
+  proc = &chain;
   return 0;
-} catch (const std::bad_alloc&) {
-  return -1;  // the old chain stays
 }
 
 int SessionActivity::postProcess(void* data, int len, void** out, int* outLen) noexcept {
@@ -70,30 +44,30 @@ int SessionActivity::postProcess(void* data, int len, void** out, int* outLen) n
   if (proc == nullptr) return passThrough(data, len, out, outLen);
 
   const auto record = recordBytes(data, len);
-  const auto result = work.bytes();
-  // A record of no bytes stands for the one left in `work`: the last record, or the last result made of it.
-  if (!record.empty()) {
+  if (!record.empty()) {  // an empty record repeats what is in `work`
     if (record.size() < kHeaderSize) return -1;
-    const int items = loadI16(record, kValueOffset);
-    if (items > 0 && record.size() < kHeaderSize + ActivityRecord::kSize * static_cast<size_t>(items)) return -1;
-    std::memcpy(result.data(), record.data(), kHeaderSize);
-    copyBytes<ActivityRecord::kSize>(result.data() + kHeaderSize, record.data() + kHeaderSize,
-                                     ActivityRecord::kSize * static_cast<size_t>(std::clamp(items, 0, kMostItems)));
+    const auto count = static_cast<size_t>(std::max<int>(loadI16(record, kValueOffset), 0));
+    const size_t bytes = count * ActivityDecision::kSize;
+    if (record.size() < kHeaderSize + bytes) return -1;
+    std::memcpy(work.data(), record.data(), kHeaderSize);
+    copyBytes<ActivityDecision::kSize>(work.data() + kHeaderSize, record.data() + kHeaderSize,
+                                       std::min(bytes, work.size() - kHeaderSize));
   }
-  const int count = std::min<int>(loadI16(result, kValueOffset), kMostItems);
-  return proc->accept(result.data() + kHeaderSize, count) ? deliver(out, outLen) : 0;
+  const int count = std::min<int>(loadI16(work, kValueOffset), kMostDecisions);
+  return std::visit(
+      [&](auto& shape) { return shape.accept(work.data() + kHeaderSize, count) ? deliver(shape, out, outLen) : 0; },
+      chain);
 }
 
-int SessionActivity::deliver(void** out, int* outLen) {
-  const auto result = work.bytes();
-  Proc& last = *proc;
-  const size_t delivered = static_cast<size_t>(last.bufferLength());
-  const size_t bytes = delivered * ActivityRecord::kSize;
-  *out = result.data();
+template <class Shape>
+int SessionActivity::deliver(Shape& shape, void** out, int* outLen) {
+  const auto delivered = static_cast<size_t>(shape.length());
+  const size_t bytes = delivered * ActivityDecision::kSize;
+  storeU16(work, kValueOffset, static_cast<uint16_t>(delivered));
+  copyBytes<ActivityDecision::kSize>(work.data() + kHeaderSize, shape.buffer(), bytes);
+  *out = work.data();
   *outLen = static_cast<int>(kHeaderSize + bytes);
-  storeU16(result, kValueOffset, static_cast<uint16_t>(delivered));
-  copyBytes<ActivityRecord::kSize>(result.data() + kHeaderSize, last.buffer(), bytes);
-  last.reset();
+  shape.reset();
   return 1;
 }
 

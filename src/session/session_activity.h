@@ -1,43 +1,63 @@
 #pragma once
 
+#include <array>
+#include <cstdint>
+#include <memory>
+#include <span>
+#include <variant>
+
+#include "bytes.h"
 #include "option/option_activity.h"
+#include "proc/activity_decision.h"
+#include "proc/proc_change.h"
+#include "proc/proc_mask.h"
+#include "proc/proc_mixer_activity.h"
+#include "proc/proc_nm.h"
 #include "session/session.h"
 
 namespace senseloom {
 
 // What a chain of activity stages knows of its elements.
-bool _activity_equal_func(const void* a, const void* b);  // same class id; a null element equals only another one
-void _activity_mask_func(void* item, int mask);           // a class outside `mask` becomes class 0
-int _activity_check_seq_func(const void* item);           // sequence number; -1 for null
 
-// Physical activity: gathers class decisions into batches and delivers each batch voted, masked and on change, as the
+// Whether the class ids are the same. A null element equals only another one.
+inline bool _activity_equal_func(const void* a, const void* b) {
+  if (a == nullptr || b == nullptr) return a == b;
+  return ActivityDecision::at(a).classId() == ActivityDecision::at(b).classId();
+}
+// A class outside `mask` becomes class 0.
+inline void _activity_mask_func(void* item, int mask) {
+  if (item == nullptr) return;
+  const auto decision = ActivityDecision::at(item);
+  if (!bitAt(mask, decision.classId())) decision.withClass(0).storeAt(item);
+}
+
+// Physical activity: gathers decisions into batches and delivers each batch voted, masked and on change, as the
 // session's option asks. Until the sensor's first negotiation records pass through untouched.
-class SessionActivity final : public Session {
+class SessionActivity final : public SessionOf<OptionActivity> {
  public:
-  SessionActivity() : Session(OptionActivity::kind.sensor, std::make_unique<OptionActivity>()) {}
-
   int postProcess(void* data, int len, void** out, int* outLen) noexcept override;
   int buildProc() override;
 
  private:
-  // All that the chain is made of.
-  struct ChainPlan {
-    int batch;  // elements
-    int summary;
-    int weightVar;
-    int classMask;
-    int mode;
-    bool operator==(const ChainPlan&) const = default;
-  };
-  static std::unique_ptr<Proc> makeChain(const ChainPlan& plan);
+  // The vote counts unmasked classes: a winner that the client did not ask for is delivered as class 0. Change is seen
+  // last, so that a client hears nothing of changes among classes that it did not ask for.
+  using Batch = ProcNM<ActivityDecision::kSize>;
+  using Decisions = ProcMask<Batch, _activity_mask_func>;
+  using Votes = ProcMask<ProcMixerActivity<Batch>, _activity_mask_func>;
+  using Chain = std::variant<Decisions, Votes, ProcChange<Decisions, _activity_equal_func>,
+                             ProcChange<Votes, _activity_equal_func>>;
 
-  // Hands out the chain's result. Apart from postProcess(), which most often has none.
-  [[gnu::noinline]] int deliver(void** out, int* outLen);
+  static constexpr int kMostDecisions = 256;  // the largest batch: 1 << the largest logN
 
-  static constexpr int kMostItems = 256;  // the largest batch: 1 << the largest logN
+  Chain makeChain(std::span<uint8_t> batch) const;
+  // Hands out the chain's result. Out of line: most records deliver nothing.
+  template <class Shape>
+  [[gnu::noinline]] int deliver(Shape& shape, void** out, int* outLen);
 
-  ChainPlan plan{};  // of the chain, while there is one
-  ResultBuffer<10 + 2 * kMostItems> work;
+  Chain chain;                        // in force when `proc` points at it
+  std::unique_ptr<uint8_t[]> memory;  // of the batch
+  size_t memorySize = 0;
+  std::array<uint8_t, 10 + 2 * kMostDecisions> work{};  // the last record, or the last result made of it
 };
 
 }  // namespace senseloom

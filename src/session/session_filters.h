@@ -1,7 +1,5 @@
 #pragma once
 
-#include <memory>
-
 #include "option/option_audio_classification.h"
 #include "option/option_class_masks.h"
 #include "option/option_dtwgs.h"
@@ -15,16 +13,16 @@
 // client asked for.
 namespace senseloom {
 
-// Which records a kind delivers: `wants` is asked about every record of at least `kFieldEnd` bytes, shorter ones do not
-// pass.
+// Which records a kind delivers: `wants` is asked about every record of at least `kFieldEnd` bytes; shorter ones are
+// not delivered.
 
 // The value is the number of a class, from 1. Its place in the mask is taken modulo 32 on purpose: class 0 is bit 31,
 // class 33 is bit 0.
 template <class Number>
 struct ClassNumber {
   static constexpr size_t kFieldEnd = kValueOffset + sizeof(Number);
-  template <class OptionKind>
-  static bool wants(std::span<const uint8_t> record, const OptionKind& option) {
+  template <class OptionClass>
+  static bool wants(std::span<const uint8_t> record, const OptionClass& option) {
     const auto number = static_cast<uint32_t>(int32_t{load<Number>(record, kValueOffset)});
     return bitAt(option.classMask(), static_cast<int32_t>(number - 1));
   }
@@ -34,29 +32,27 @@ struct ClassNumber {
 // negative value has bits 16 to 31, too.
 struct ClassSet {
   static constexpr size_t kFieldEnd = kValueOffset + sizeof(int16_t);
-  template <class OptionKind>
-  static bool wants(std::span<const uint8_t> record, const OptionKind& option) {
+  template <class OptionClass>
+  static bool wants(std::span<const uint8_t> record, const OptionClass& option) {
     return (loadI16(record, kValueOffset) & option.classMask()) != 0;
   }
 };
 
 struct Everything {
   static constexpr size_t kFieldEnd = 0;
-  template <class OptionKind>
-  static bool wants(std::span<const uint8_t>, const OptionKind&) {
+  template <class OptionClass>
+  static bool wants(std::span<const uint8_t>, const OptionClass&) {
     return true;
   }
 };
 
-template <class OptionKind, class Filter>
-class SessionFilter final : public Session {
+template <class OptionClass, class Filter>
+class SessionFilter final : public SessionOf<OptionClass> {
  public:
-  SessionFilter() : Session(OptionKind::kind.sensor, std::make_unique<OptionKind>()) {}
-
   int postProcess(void* data, int len, void** out, int* outLen) noexcept override {
     if (len < static_cast<int>(Filter::kFieldEnd)) return 0;
-    if (!Filter::wants(recordBytes(data, len), static_cast<const OptionKind&>(*option))) return 0;
-    return passThrough(data, len, out, outLen);
+    if (!Filter::wants(recordBytes(data, len), this->wanted)) return 0;
+    return this->passThrough(data, len, out, outLen);
   }
 };
 

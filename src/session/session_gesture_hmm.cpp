@@ -32,7 +32,7 @@ int32_t session_num = 0;
 uint64_t ts = 0;               // timestamp of the last record fed to the engine
 uint16_t current_gesture = 0;  // class number found in it; 0: none
 
-// The class of a recognised name; 0 for a name that is no class's.
+// The class of a recognised name; 0 if no class has that name.
 uint16_t classOf(const char* name) {
   for (size_t i = 0; i < classNames.size(); ++i) {
     if (std::strcmp(name, classNames[i]) == 0) return static_cast<uint16_t>(i + 1);
@@ -65,7 +65,7 @@ void recognise(std::span<const uint8_t> record) {
 
 }  // namespace
 
-SessionGestureHMM::SessionGestureHMM() : Session(OptionGestureHMM::kind.sensor, std::make_unique<OptionGestureHMM>()) {
+SessionGestureHMM::SessionGestureHMM() {
   if (++session_num == 1 && !gesture_initial(0, 0)) {
     __android_log_print(ANDROID_LOG_ERROR, kLogTag, "hmm gesture algorithm start return false");
   }
@@ -86,9 +86,9 @@ int SessionGestureHMM::postProcess(void* data, int len, void** out, int* outLen)
     recognise(record);
   }
   // No gesture is class 0, which stands for bit 31: no mask that a client can set has it.
-  if (!bitAt(static_cast<const OptionGestureHMM&>(*option).classMask(), current_gesture - 1)) return 0;
+  if (!bitAt(wanted.classMask(), current_gesture - 1)) return 0;
 
-  const auto result = work.bytes();
+  const std::span<uint8_t> result = work;
   std::memcpy(result.data(), record.data(), record.size());
   storeU16(result, kValueOffset, current_gesture);
   *out = result.data();

@@ -1,5 +1,8 @@
 #pragma once
 
+#include <array>
+#include <cstdint>
+
 #include "option/option_class_masks.h"
 #include "session/session.h"
 
@@ -7,9 +10,9 @@ namespace senseloom {
 
 // Hand-drawn gestures: feeds the motion samples of each record to the platform's gesture engine and delivers the record
 // with the number of the recognised class, if the client asked for that class. One engine serves all gesture sessions,
-// and a record that several of them get is recognised once: it is told by its timestamp, so that different records must
-// carry different timestamps.
-class SessionGestureHMM final : public Session {
+// and a record that several of them get is recognised once: it is identified by its timestamp, so different records
+// must carry different timestamps.
+class SessionGestureHMM final : public SessionOf<OptionGestureHMM> {
  public:
   SessionGestureHMM();
   ~SessionGestureHMM() override;
@@ -19,7 +22,7 @@ class SessionGestureHMM final : public Session {
  private:
   static constexpr int kMostBytes = 2052;  // the largest record
 
-  ResultBuffer<kMostBytes> work;
+  std::array<uint8_t, kMostBytes> work{};
 };
 
 }  // namespace senseloom

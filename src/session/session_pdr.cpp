@@ -13,15 +13,15 @@ int SessionPDR::postProcess(void* data, int len, void** out, int* outLen) noexce
   if (count < 0 || pendingCount + count > kMostItems) return -1;
   if (record.size() < kHeaderSize + static_cast<size_t>(count * kItemSize)) return -1;
 
-  uint8_t* const end = work.bytes().data() + kHeaderSize + pendingCount * kItemSize;
+  uint8_t* const end = work.data() + kHeaderSize + pendingCount * kItemSize;
   pendingCount += count;
   copyBytes<kItemSize>(end, record.data() + kHeaderSize, static_cast<size_t>(count * kItemSize));
-  const int threshold = 1 << static_cast<const OptionPDR&>(*option).N();  // 0 to 6
+  const int threshold = 1 << wanted.N();  // 0 to 6
   return pendingCount < threshold ? 0 : deliver(record, out, outLen);
 }
 
 int SessionPDR::deliver(std::span<const uint8_t> lastRecord, void** out, int* outLen) {
-  const auto result = work.bytes();
+  const std::span<uint8_t> result = work;
   std::memcpy(result.data() + kTimestampOffset, lastRecord.data() + kTimestampOffset, kTimestampSize);
   storeU16(result, kValueOffset, static_cast<uint16_t>(pendingCount));
   *out = result.data();

@@ -5,12 +5,11 @@
 namespace senseloom {
 
 int SessionStepCount::parseOption(const char* text) {
-  option->parse(text);
+  wanted.parse(text);
   return 0;
 }
 
 int SessionStepCount::postProcess(void* data, int len, void** out, int* outLen) noexcept {
-  const auto& wanted = static_cast<const OptionStepCount&>(*option);
   if (wanted.mode() == 1) return passThrough(data, len, out, outLen);
 
   const auto record = recordBytes(data, len);

@@ -6,11 +6,9 @@
 namespace senseloom {
 
 // Step count: every update in mode 1, only multiples of `logN` hundred steps in mode 0.
-class SessionStepCount final : public Session {
+class SessionStepCount final : public SessionOf<OptionStepCount> {
  public:
-  SessionStepCount() : Session(OptionStepCount::kind.sensor, std::make_unique<OptionStepCount>()) {}
-
-  // Accepts every string, on purpose: one that can not be read leaves the option as it was.
+  // Accepts every string, on purpose: one that cannot be read leaves the option as it was.
   int parseOption(const char* text) override;
   int postProcess(void* data, int len, void** out, int* outLen) noexcept override;
 };

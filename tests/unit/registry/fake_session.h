@@ -1,7 +1,6 @@
 #pragma once
 
 #include <cstdio>
-#include <memory>
 #include <string>
 #include <utility>
 
@@ -17,7 +16,7 @@ class NamedSession final : public senseloom::Session {
   using Events = NamedOption::Events;
 
   NamedSession(const char* sensor, std::string ownName, Events& story)
-      : Session(sensor, std::make_unique<NamedOption>(ownName, story)), label(std::move(ownName)), events(story) {}
+      : Session(sensor, own), label(ownName), events(story), own(std::move(ownName), story) {}
   ~NamedSession() override { events.push_back("session " + label + " destroyed"); }
 
   int postProcess(void* data, int len, void** out, int* outLen) noexcept override {
@@ -30,14 +29,15 @@ class NamedSession final : public senseloom::Session {
     return buildResult;
   }
 
-  NamedOption& namedOption() { return static_cast<NamedOption&>(*option); }
-
   const std::string label;
   int processResult = 1;
   int buildResult = 0;
 
  private:
   Events& events;
+
+ public:
+  NamedOption own;
 };
 
 // The line that tells of a session being merged.

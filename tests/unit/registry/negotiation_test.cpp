@@ -3,7 +3,6 @@
 #include <gtest/gtest.h>
 
 #include "fake_option.h"
-#include "fake_sensor.h"
 #include "fake_session.h"
 
 namespace senseloom {
@@ -11,6 +10,11 @@ namespace {
 
 using Events = std::vector<std::string>;
 using Log = std::vector<fake::LogLine>;
+
+class FakeSensor final : public ContextSensor {
+ public:
+  Session* createSession() const override { return nullptr; }
+};
 
 class Negotiation : public testing::Test {
  protected:
@@ -32,7 +36,7 @@ class Negotiation : public testing::Test {
       {"GSFLK", "b", events},
       {"GSFLK", "c", events},
   };
-  fake::Sensor sensor;
+  FakeSensor sensor;
   ctx_option_t* list = nullptr;
 };
 
@@ -60,7 +64,7 @@ TEST_F(Negotiation, WithoutSessionsMergesNothing) {
   EXPECT_EQ(fake::platform().takeLog(), Log{});
 }
 
-TEST_F(Negotiation, KeepsAMergedOptionThatCanNotBeRendered) {
+TEST_F(Negotiation, KeepsAMergedOptionThatCannotBeRendered) {
   auto merged = option("new");
   Option* const isNew = merged.get();
   merged->renders = false;

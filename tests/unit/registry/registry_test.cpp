@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <memory>
+#include <new>
 #include <set>
 #include <string>
 
@@ -36,12 +38,12 @@ TEST_F(Registry, IsEmptyUntilItIsInitialised) {
 }
 
 TEST_F(Registry, HasTwelveSensorsByName) {
-  ASSERT_TRUE(ensureSensors());
+  _init_senseloom();
   std::set<ContextSensor*> sensors;
   for (const char* name : kNames) {
     ContextSensor* sensor = findSensor(name);
     ASSERT_NE(sensor, nullptr) << name;
-    EXPECT_STREQ(sensor->createSession()->name, name);
+    EXPECT_STREQ(std::unique_ptr<Session>(sensor->createSession())->name, name);
     EXPECT_EQ(sensor->mergedOption, nullptr);
     EXPECT_TRUE(sensor->sessions.empty());
     sensors.insert(sensor);
@@ -50,7 +52,7 @@ TEST_F(Registry, HasTwelveSensorsByName) {
 }
 
 TEST_F(Registry, MatchesNamesExactly) {
-  ASSERT_TRUE(ensureSensors());
+  _init_senseloom();
   for (const char* name : {"", "phyac", "PHYA", "PHYAC ", " PHYAC", "PHYACX", "Pdr", "LPE", "GSPXGSPXGSPX"}) {
     EXPECT_EQ(findSensor(name), nullptr) << name;
   }
@@ -58,17 +60,17 @@ TEST_F(Registry, MatchesNamesExactly) {
 }
 
 TEST_F(Registry, IsInitialisedOnce) {
-  ASSERT_TRUE(ensureSensors());
+  _init_senseloom();
   ContextSensor* sensors[12];
   for (size_t i = 0; i < 12; ++i) sensors[i] = findSensor(kNames[i]);
   const fake::AllocationCount allocations;
-  ASSERT_TRUE(ensureSensors());
+  _init_senseloom();
   EXPECT_EQ(allocations.made(), 0U);
   for (size_t i = 0; i < 12; ++i) EXPECT_EQ(findSensor(kNames[i]), sensors[i]) << kNames[i];
 }
 
 TEST_F(Registry, SensorsAreDeletedInTheirOrder) {
-  ASSERT_TRUE(ensureSensors());
+  _init_senseloom();
   Events events;
   Events expected;
   for (const char* name : kNames) {
@@ -82,7 +84,7 @@ TEST_F(Registry, SensorsAreDeletedInTheirOrder) {
 }
 
 TEST_F(Registry, KeepsThePointersToDeletedSensors) {
-  ASSERT_TRUE(ensureSensors());
+  _init_senseloom();
   ContextSensor* sensors[12];
   for (size_t i = 0; i < 12; ++i) sensors[i] = findSensor(kNames[i]);
   ctx_uninit();
@@ -90,7 +92,7 @@ TEST_F(Registry, KeepsThePointersToDeletedSensors) {
 }
 
 TEST_F(Registry, HasNewSensorsAfterTheNextInitialisation) {
-  ASSERT_TRUE(ensureSensors());
+  _init_senseloom();
   Events events;
   fake::NamedSession session("STAP", "a", events);
   for (const char* name : kNames) {
@@ -98,7 +100,7 @@ TEST_F(Registry, HasNewSensorsAfterTheNextInitialisation) {
     findSensor(name)->mergedOption = std::make_unique<fake::NamedOption>(name, events);
   }
   ctx_uninit();
-  ASSERT_TRUE(ensureSensors());
+  _init_senseloom();
   for (const char* name : kNames) {
     EXPECT_TRUE(findSensor(name)->sessions.empty()) << name;
     EXPECT_EQ(findSensor(name)->mergedOption, nullptr) << name;
@@ -106,7 +108,7 @@ TEST_F(Registry, HasNewSensorsAfterTheNextInitialisation) {
 }
 
 TEST_F(Registry, UninitialisingNeitherTouchesSessionsNorStopsSensors) {
-  ASSERT_TRUE(ensureSensors());
+  _init_senseloom();
   ASSERT_TRUE(findSensor("LPE_P")->onStart());
   fake::platform().calls.clear();
   auto session = std::make_unique<fake::NamedSession>("LPE_P", "a", fake::platform().calls);
@@ -124,7 +126,11 @@ TEST_F(Registry, MakesAllSensorsOrNone) {
   size_t failures = 0;
   for (;; ++failures) {
     const fake::FailingAllocation next(failures + 1);
-    if (ensureSensors()) break;
+    try {
+      _init_senseloom();
+      break;
+    } catch (const std::bad_alloc&) {
+    }
     expectNoSensors();
     EXPECT_FALSE(gInited);
   }

@@ -114,7 +114,7 @@ TEST(SessionSet, RoomOfErasedSessionsIsUsedAgain) {
   EXPECT_EQ(allocations.made(), 0U);
 }
 
-TEST(SessionSet, StaysAsItWasWhenItCanNotGrow) {
+TEST(SessionSet, StaysAsItWasWhenItCannotGrow) {
   SessionSet set;
   int failures = 0;
   for (uintptr_t i = 1; i <= 100; ++i) {

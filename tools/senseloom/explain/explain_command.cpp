@@ -7,10 +7,10 @@
 #include "explain/explainer.h"
 #include "explain/log_capture.h"
 #include "input_error.h"
-#include "trace/json.h"
 #include "plot/replay_plot.h"
 #include "replay/replay_progress.h"
 #include "replay/replayer.h"
+#include "trace/json.h"
 #include "trace/trace_reader.h"
 
 namespace senseloom::tool {

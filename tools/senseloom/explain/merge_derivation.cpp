@@ -28,9 +28,9 @@ class Derivation {
       deriveTemplateGesture();
     } else {
       for (const OptionProperty& property : kind.properties) {
-        result.properties->push_back({property.id, property.key == OptionProperty::kComputed
-                                                       ? computed(property.id)
-                                                       : *result.keys[static_cast<size_t>(property.key)].value});
+        const size_t key = kind.findKey(property.name);
+        result.properties->push_back(
+            {property.id, key < kind.keys.size() ? *result.keys[key].value : computed(property.id)});
       }
     }
     return std::move(result);

@@ -4,8 +4,8 @@
 #include <string>
 #include <utility>
 
-#include "trace/hex.h"
 #include "terminal/text_table.h"
+#include "trace/hex.h"
 
 namespace senseloom::tool {
 namespace {
@@ -31,7 +31,7 @@ bool agree(const Property& returned, const ExpectedProperty& expected) {
 const OptionProperty* propertyOf(const OptionDescription& kind, size_t key) {
   const auto found =
       std::find_if(kind.properties.begin(), kind.properties.end(),
-                   [key](const OptionProperty& property) { return property.key == static_cast<int>(key); });
+                   [&kind, key](const OptionProperty& property) { return kind.findKey(property.name) == key; });
   return found == kind.properties.end() ? nullptr : &*found;
 }
 
@@ -77,7 +77,7 @@ class Table {
     for (const Property& entry : properties) {
       const auto property = std::find_if(kind.properties.begin(), kind.properties.end(),
                                          [&entry](const OptionProperty& known) { return known.id == entry.id; });
-      if (property == kind.properties.end() || property->key != OptionProperty::kComputed) continue;
+      if (property == kind.properties.end() || kind.findKey(property->name) < kind.keys.size()) continue;
       TextRow row(2 + participants.size());
       row[0] = property->name;
       addRow(std::move(row), "", std::to_string(entry.id) + " = " + valueText(entry), "");

@@ -3,18 +3,18 @@
 #include <algorithm>
 #include <iterator>
 
-#include "option/option_kinds.h"
+#include "option/all_options.h"
 
 namespace senseloom::tool {
 
 std::span<const OptionDescription* const> optionDescriptions() {
-  return kOptionKinds;
+  return kOptionDescriptions;
 }
 
 const OptionDescription* findOptionDescription(std::string_view sensor) {
-  const auto* const* found = std::find_if(std::begin(kOptionKinds), std::end(kOptionKinds),
+  const auto* const* found = std::find_if(std::begin(kOptionDescriptions), std::end(kOptionDescriptions),
                                           [sensor](const OptionDescription* kind) { return kind->sensor == sensor; });
-  return found == std::end(kOptionKinds) ? nullptr : *found;
+  return found == std::end(kOptionDescriptions) ? nullptr : *found;
 }
 
 const char* propertyName(std::string_view sensor, int32_t id) {

@@ -4,9 +4,9 @@
 #include <vector>
 
 #include "input_error.h"
-#include "trace/json.h"
 #include "sensors/option_data.h"
 #include "terminal/text_table.h"
+#include "trace/json.h"
 
 namespace senseloom::tool {
 namespace {

@@ -11,9 +11,9 @@
 
 namespace senseloom {
 
-// The descriptions of all option kinds, in the registry's order.
-inline constexpr const OptionDescription* kOptionKinds[] = {
-#define SENSOR_KIND(Kind) &Option##Kind::kind,
+// The descriptions of all kinds of option, in the registry's order.
+inline constexpr const OptionDescription* kOptionDescriptions[] = {
+#define SENSOR_KIND(SensorClass, SessionClass, OptionClass, BaseClass) &OptionClass::kind,
 #include "sensor_kinds.def"
 #undef SENSOR_KIND
 };
