@@ -9,6 +9,7 @@
 #include "audio/aware_device.h"
 #include "senseloom.h"
 
+// Every call of the platform, and the log is one, may clear what callers see, too: it is read anew after each.
 constinit aware_hw_device* device = nullptr;
 constinit bool gIsActivated = false;
 
@@ -57,13 +58,14 @@ bool openAudio() {
   int rc = hw_get_module_by_class(kClass, kInstance, &module);
   // The first text names audio_hal_init() in all three functions, on purpose.
   __android_log_print(ANDROID_LOG_DEBUG, kTag, "%s load audio hw module %s.%s (%s)", "bool audio_hal_init()", kClass,
-                      kInstance, std::strerror(-rc));
+                      kInstance, std::strerror(static_cast<int>(0U - static_cast<unsigned>(rc))));
   if (rc != 0) return false;
   rc = module->methods->open(module, kInterface, reinterpret_cast<hw_device_t**>(&device));
   __android_log_print(ANDROID_LOG_DEBUG, kTag, "device open result %d\n", rc);
   if (rc != 0 || device == nullptr) return false;
-  __android_log_print(ANDROID_LOG_DEBUG, kTag, "device version %d\n", static_cast<int>(device->common.version));
-  return device->common.version == kVersion;
+  const uint32_t version = device->common.version;
+  __android_log_print(ANDROID_LOG_DEBUG, kTag, "device version %d\n", static_cast<int>(version));
+  return version == kVersion;
 }
 
 bool activateAudio() {
@@ -72,8 +74,11 @@ bool activateAudio() {
     __android_log_print(ANDROID_LOG_DEBUG, kTag, "already activated, return");
     return true;
   }
-  __android_log_print(ANDROID_LOG_DEBUG, kTag, "activating aware... %p\n", static_cast<void*>(device));
-  if (device->activate(device, &kParameters) != 0) {
+  AwareParameters parameters = kParameters;  // built anew each time, in memory that the device may write to
+  if (device == nullptr) return false;
+  aware_hw_device* const opened = device;
+  __android_log_print(ANDROID_LOG_DEBUG, kTag, "activating aware... %p\n", static_cast<void*>(opened));
+  if (opened->activate(opened, &parameters) != 0) {
     __android_log_print(ANDROID_LOG_ERROR, kTag, "activated aware failed\n");
     return false;
   }
@@ -88,14 +93,16 @@ bool deactivateAudio() {
     __android_log_print(ANDROID_LOG_DEBUG, kTag, "already deactivated, return");
     return true;
   }
+  if (device == nullptr) return true;
+  aware_hw_device* const opened = device;
   std::puts("deactivating aware session...");  // this one goes to standard output instead of the log, on purpose
-  if (device->deactivate(device) != 0) {
+  if (opened->deactivate(opened) != 0) {
     __android_log_print(ANDROID_LOG_ERROR, kTag, "deactivated aware session failed \n");
     return false;
   }
   __android_log_print(ANDROID_LOG_DEBUG, kTag, "deactivated aware session successful... \n");
   gIsActivated = false;
-  device->common.close(&device->common);
+  if (device != nullptr) device->common.close(&device->common);
   device = nullptr;
   return true;
 }

@@ -4,6 +4,8 @@
 
 #include <algorithm>
 
+#include "option/json_text.h"
+
 namespace senseloom {
 namespace {
 
@@ -25,7 +27,7 @@ int32_t readInteger(const json_t* root, const char* key, int32_t fallback) {
 bool readKeys(const OptionDescription& kind, const char* text, std::span<int32_t> given, std::span<int32_t> settings) {
   if (text == nullptr && !kind.nullIsUnparsable) return false;
 
-  const JsonRoot root(json_loads(text, 0, nullptr));
+  const JsonRoot root = readJson(text);
   if (root == nullptr) {
     if (kind.unparsableMessage != nullptr) {
       __android_log_print(ANDROID_LOG_ERROR, kind.logTag, kind.unparsableMessage, text != nullptr ? text : "(null)");

@@ -13,11 +13,6 @@
 
 namespace senseloom {
 
-struct JsonRelease {
-  void operator()(json_t* json) const { json_decref(json); }
-};
-using JsonRoot = std::unique_ptr<json_t, JsonRelease>;
-
 // The value of an integer key, cut to 32 bits; `fallback` when the key is missing or of any other type.
 int32_t readInteger(const json_t* root, const char* key, int32_t fallback);
 

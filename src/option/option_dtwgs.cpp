@@ -8,6 +8,7 @@
 
 #include "bytes.h"
 #include "option/integer_option.h"
+#include "option/json_text.h"
 
 namespace senseloom {
 namespace {
@@ -61,7 +62,7 @@ bool OptionDTWGS::DTWGSTemp::setTemplate(int which, const char* text) {
 }
 
 int OptionDTWGS::parse(const char* text) {
-  const JsonRoot root(json_loads(text, 0, nullptr));
+  const JsonRoot root = readJson(text);
   if (root == nullptr) return -1;
 
   // Templates are stored before anything is checked, and so even when the rest of the string is refused.

@@ -34,6 +34,15 @@ constexpr size_t kSensors = std::size(kSensorKinds);
 // because those of deleted sensors stay until the next ones overwrite them.
 constinit std::array<ContextSensor*, kSensors> gSensors{};
 
+// Gives back, at the end of its life, the room for sessions that no session is in.
+struct UnusedRoom {
+  ContextSensor& sensor;
+  ~UnusedRoom() {
+    gSessions.releaseUnused();
+    if (sensor.sessions.empty()) sensor.sessions.shrink_to_fit();
+  }
+};
+
 }  // namespace
 
 constinit SessionSet gSessions;
@@ -62,6 +71,7 @@ ContextSensor* findSensor(const char* name) noexcept {
 }
 
 Session* openSession(ContextSensor& sensor) {
+  const UnusedRoom unused{sensor};
   gSessions.reserveOne();
   auto& sessions = sensor.sessions;
   if (sessions.size() == sessions.capacity()) sessions.reserve(2 * sessions.size() + 1);
@@ -80,6 +90,7 @@ int closeSession(Session& session, ctx_option_t** out) {
   const auto first = std::find_if(sessions.begin(), sessions.end(), [&](auto* other) { return other != &session; });
   if (first != sessions.end()) merged = (*first)->option->clone();
 
+  const UnusedRoom unused{sensor};
   gSessions.erase(&session);
   std::unique_ptr<Session> closing(&session);
   std::erase(sessions, &session);

@@ -8,14 +8,14 @@ namespace senseloom {
 void SessionSet::reserveOne() {
   if (2 * (count + 1) <= mask + 1) return;
   constexpr size_t kFewestSlots = 16;
-  SessionSet larger;
-  larger.mask = std::max(2 * (mask + 1), kFewestSlots) - 1;
-  larger.owned = std::make_unique<Session*[]>(larger.mask + 1);
-  larger.slots = larger.owned.get();
-  for (size_t i = 0; i <= mask; ++i) {
-    if (slots[i] != nullptr) larger.insert(slots[i]);
+  const size_t size = std::max(2 * (mask + 1), kFewestSlots);
+  Session** const old = std::exchange(slots, new Session*[size]());
+  const size_t oldMask = std::exchange(mask, size - 1);
+  count = 0;
+  for (size_t i = 0; i <= oldMask; ++i) {
+    if (old[i] != nullptr) insert(old[i]);
   }
-  *this = std::move(larger);
+  if (old != noSlots) delete[] old;
 }
 
 void SessionSet::insert(Session* session) {
@@ -39,6 +39,12 @@ void SessionSet::erase(const Session* session) {
   slots[hole] = nullptr;
   --count;
   recent = nullptr;
+}
+
+void SessionSet::releaseUnused() {
+  if (count != 0 || slots == noSlots) return;
+  delete[] std::exchange(slots, noSlots);
+  mask = 0;
 }
 
 }  // namespace senseloom

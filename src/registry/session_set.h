@@ -2,7 +2,6 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <memory>
 
 #include "session/session.h"
 
@@ -10,9 +9,14 @@ namespace senseloom {
 
 // A set of sessions by address: a hash table with open addressing. Every record passes through its look-up, which takes
 // the same time however many sessions are open.
+//
+// An empty set has no memory. It has no destructor, either: the one set of the process must be whole for callers that
+// close their sessions, or go on using them, while the process ends.
 class SessionSet {
  public:
   constexpr SessionSet() = default;
+  SessionSet(const SessionSet&) = delete;
+  SessionSet& operator=(const SessionSet&) = delete;
 
   // The session at that address; null when none of the set is.
   Session* find(const void* handle) {
@@ -28,6 +32,8 @@ class SessionSet {
   void insert(Session* session);
   // Removes a session of the set.
   void erase(const Session* session);
+  // Gives the memory of an empty set back.
+  void releaseUnused();
 
  private:
   // The slot where the search for an address begins. Addresses are multiples of a power of 2; the multiplication
@@ -38,7 +44,6 @@ class SessionSet {
   // What an empty set searches: one slot, always free.
   static inline constinit Session* noSlots[1] = {};
 
-  std::unique_ptr<Session*[]> owned;
   Session** slots = noSlots;  // null where free; at least half are, so that searches are short
   size_t mask = 0;            // number of slots, a power of 2, minus 1
   size_t count = 0;

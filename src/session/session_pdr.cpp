@@ -16,7 +16,7 @@ int SessionPDR::postProcess(void* data, int len, void** out, int* outLen) noexce
   uint8_t* const end = work.data() + kHeaderSize + pendingCount * kItemSize;
   pendingCount += count;
   copyBytes<kItemSize>(end, record.data() + kHeaderSize, static_cast<size_t>(count * kItemSize));
-  const int threshold = 1 << wanted.N();  // 0 to 6
+  const auto threshold = static_cast<int32_t>(1U << (static_cast<uint32_t>(wanted.N()) & 31U));
   return pendingCount < threshold ? 0 : deliver(record, out, outLen);
 }
 

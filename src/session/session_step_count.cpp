@@ -11,6 +11,7 @@ int SessionStepCount::parseOption(const char* text) {
 
 int SessionStepCount::postProcess(void* data, int len, void** out, int* outLen) noexcept {
   if (wanted.mode() == 1) return passThrough(data, len, out, outLen);
+  if (wanted.mode() != 0) return 0;
 
   const auto record = recordBytes(data, len);
   if (record.size() < kValueOffset + sizeof(int32_t)) return 0;

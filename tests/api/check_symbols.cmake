@@ -54,5 +54,5 @@ else()
   list(TRANSFORM imports REPLACE "@.*" "")
   require_equal("imported" "${imports}"
                 "__android_log_print;gesture_close;gesture_initial;gesture_process_single_data;hw_get_module_by_class;\
-json_delete;json_integer_value;json_loads;json_object_get;json_string_value")
+json_delete;json_get_alloc_funcs;json_integer_value;json_loads;json_object_get;json_string_value")
 endif()
