@@ -63,7 +63,7 @@ constexpr const char* kBatchOf4 = R"({"logN": 2})";
 constexpr const char* kBatchOf32 = R"({"logN": 5})";
 constexpr const char* kBatchOf256 = R"({"logN": 8})";
 constexpr const char* kOnChange = R"({"mode": 1, "logN": 2})";
-constexpr const char* kGrowingWeights = R"({"logN": 5, "weightVar": 3})";
+constexpr const char* kGrowingWeights = R"({"logN": 8, "weightVar": 3})";
 constexpr const char* kHalfOfFlicks = R"({"classMask": 21})";
 constexpr const char* kAllFlicks = R"({"classMask": 63, "level": 0})";
 constexpr const char* kTaps = R"({"classMask": 3, "level": 0})";
@@ -86,8 +86,11 @@ constexpr Scenario kScenarios[] = {
     {"activity, 64 items, batch 4", eachRecordToLibrary, "PHYAC", kBatchOf4, activitiesOf<64>},
     {"activity, 64 items, batch 32", eachRecordToLibrary, "PHYAC", kBatchOf32, activitiesOf<64>},
     {"activity, 64 items, batch 256", eachRecordToLibrary, "PHYAC", kBatchOf256, activitiesOf<64>},
-    {"activity, on change, batch 4", eachRecordToLibrary, "PHYAC", kOnChange, activitiesOf<1>},
-    {"activity, growing weights, batch 32", eachRecordToLibrary, "PHYAC", kGrowingWeights, activitiesOf<1>},
+    {"activity, 1 item, on change, batch 1", eachRecordToLibrary, "PHYAC", R"({"mode": 1})", activitiesOf<1>},
+    {"activity, 1 item, on change, batch 4", eachRecordToLibrary, "PHYAC", kOnChange, activitiesOf<1>},
+    {"activity, 64 items, on change, batch 1", eachRecordToLibrary, "PHYAC", R"({"mode": 1})", activitiesOf<64>},
+    {"activity, 64 items, on change, batch 4", eachRecordToLibrary, "PHYAC", kOnChange, activitiesOf<64>},
+    {"activity, 64 items, growing, batch 256", eachRecordToLibrary, "PHYAC", kGrowingWeights, activitiesOf<64>},
     {"fan-out, 100 sessions", eachClient, "GSFLK", kAllFlicks, randomFlicks, 100},
     {"fan-out, 10000 sessions", eachClient, "GSFLK", kAllFlicks, randomFlicks, 10000},
     {"tapping option, 1 session", setOption, "STAP", kTaps, randomFlicks, 1},

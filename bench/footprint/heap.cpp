@@ -1,5 +1,5 @@
-// How much of the heap an open session holds. Prints a line for each case, in bytes: the sizes of a session's objects,
-// its share of the tables that know all sessions, and what the heap itself adds to each block.
+// How much of the heap an open session holds. Prints a line for each case: the sizes of a session's objects in bytes, its
+// share of the tables that know all sessions, what the heap itself adds to each block, and the number of its blocks.
 #include <malloc.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -95,6 +95,7 @@ void measure(const Case& each) {
   std::array<void*, kSessions> handles;
   const size_t askedBefore = asked();
   const size_t heldBefore = held();
+  const size_t blocksBefore = blockCount;
   // Any session but those that make a table grow.
   size_t objects = SIZE_MAX;
   for (void*& handle : handles) {
@@ -113,8 +114,8 @@ void measure(const Case& each) {
   }
   const auto askedOfEach = static_cast<double>(asked() - askedBefore) / kSessions;
   const auto heldOfEach = static_cast<double>(held() - heldBefore) / kSessions;
-  std::printf("%s|%zu|%.1f|%.1f\n", each.title, objects, askedOfEach - static_cast<double>(objects),
-              heldOfEach - askedOfEach);
+  std::printf("%s|%zu|%.1f|%.1f|%zu\n", each.title, objects, askedOfEach - static_cast<double>(objects),
+              heldOfEach - askedOfEach, (blockCount - blocksBefore) / kSessions);
 }
 
 }  // namespace

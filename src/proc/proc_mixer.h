@@ -16,7 +16,8 @@ class ProcMixer {
   ProcMixer(Previous previous, Mix how) : prev(previous), mix(how) {}
 
   bool accept(const void* data, int count) {
-    if (mixed || !prev.accept(data, count)) return false;
+    // Asked first: most offers end there, as all do that come before the stage is reset.
+    if (!prev.accept(data, count) || mixed) return false;
     mix(prev, result.data());
     return mixed = true;
   }

@@ -53,7 +53,8 @@ int SessionActivity::postProcess(void* data, int len, void** out, int* outLen) n
     copyBytes<ActivityDecision::kSize>(work.data() + kHeaderSize, record.data() + kHeaderSize,
                                        std::min(bytes, work.size() - kHeaderSize));
   }
-  const int count = std::min<int>(loadI16(work, kValueOffset), kMostDecisions);
+  // A batch takes at most as many decisions as `work` holds, however many are counted.
+  const int count = loadI16(work, kValueOffset);
   return std::visit(
       [&](auto& shape) { return shape.accept(work.data() + kHeaderSize, count) ? deliver(shape, out, outLen) : 0; },
       chain);
