@@ -23,8 +23,9 @@ constexpr const char* kCallNames[] = {"open",
                                       "audio_hal_activate",
                                       "audio_hal_deactivate",
                                       "getSensor"};
-constexpr const char* kMisuseNames[] = {"",          "null name",       "long name",   "null out", "null length",
-                                        "null data", "negative length", "stale handle"};
+constexpr const char* kMisuseNames[] = {
+    "",          "null name",       "long name",    "null out",       "null length",
+    "null data", "negative length", "stale handle", "unknown handle", "null handle"};
 
 void add(const Json& object, const char* key, json_t* value) {
   json_object_set_new(object.get(), key, value);
@@ -76,7 +77,7 @@ json_t* answersOf(const Answers& answers) {
 
 Json objectOf(const Call& call) {
   Json object(json_object());
-  add(object, "call", json_string(kCallNames[call.what]));
+  add(object, "call", json_string(nameOf(call.what)));
   switch (call.what) {
     case Call::open:
     case Call::setOption:
@@ -91,7 +92,7 @@ Json objectOf(const Call& call) {
     case Call::open:
     case Call::dispatchToSensor:
     case Call::find:
-      add(object, "sensor", json_string(kSensorNames[call.sensor]));
+      add(object, "sensor", call.otherName ? textOf(*call.otherName) : json_string(kSensorNames[call.sensor]));
       break;
     default:
       break;
@@ -100,7 +101,7 @@ Json objectOf(const Call& call) {
     add(object, "option", call.option.isNull ? json_null() : textOf(call.option.text()));
   }
   if (call.what == Call::dispatch || call.what == Call::dispatchToSensor) add(object, "record", recordOf(call.record));
-  if (call.misuse != Call::none) add(object, "misuse", json_string(kMisuseNames[call.misuse]));
+  if (call.misuse != Call::none) add(object, "misuse", json_string(nameOf(call.misuse)));
   if (call.answers != Answers{}) add(object, "platform", answersOf(call.answers));
   return object;
 }
@@ -122,8 +123,15 @@ std::string OptionText::text() const {
   return text + '}';
 }
 
+const char* nameOf(Call::What what) {
+  return kCallNames[what];
+}
+const char* nameOf(Call::Misuse misuse) {
+  return kMisuseNames[misuse];
+}
+
 bool isTraceable(const Call& call) {
-  return call.misuse == Call::none && call.what <= Call::uninit;
+  return call.misuse == Call::none && !call.otherName && call.what <= Call::uninit;
 }
 
 std::string toJson(const Call& call) {

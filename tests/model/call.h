@@ -55,17 +55,33 @@ struct Call {
     find
   };
   // Misuses, which no trace can express.
-  enum Misuse { none, nullName, longName, nullOut, nullLength, nullData, negativeLength, staleHandle };
+  enum Misuse {
+    none,
+    nullName,
+    longName,
+    nullOut,
+    nullLength,
+    nullData,
+    negativeLength,
+    staleHandle,
+    unknownHandle,
+    nullHandle
+  };
 
   What what = uninit;
-  int session = 0;    // of open, setOption, dispatch and close: the client's name for it, a small number
-  int sensor = 0;     // of open, dispatchToSensor and find
-  OptionText option;  // of setOption
-  Bytes record;       // of a dispatch
+  int session = 0;  // of open, setOption, dispatch and close: the client's name for it, a small number
+  int sensor = 0;   // of open, dispatchToSensor and find
+  std::optional<std::string> otherName;  // of open and find: one that is not a sensor's, in place of `sensor`
+  OptionText option;                     // of setOption
+  Bytes record;                          // of a dispatch
   Misuse misuse = none;
   Answers answers;
 };
 using Sequence = std::vector<Call>;
+
+// The names of the calls and of the misuses in JSON.
+const char* nameOf(Call::What what);
+const char* nameOf(Call::Misuse misuse);
 
 // Whether a trace can express the call.
 bool isTraceable(const Call& call);

@@ -40,8 +40,8 @@ void setAnswers(const Answers& answers) {
 }
 
 // The name that a call opens or finds a sensor by.
-std::string nameOf(const Call& call) {
-  const std::string name = kSensorNames[call.sensor];
+std::string sensorNameOf(const Call& call) {
+  const std::string name = call.otherName.value_or(kSensorNames[call.sensor]);
   return call.misuse == Call::longName ? name + "ABCDE" : name;
 }
 
@@ -73,6 +73,8 @@ Client::Client() {
 }
 
 std::vector<void*> Client::targets(const Call& call) const {
+  if (call.misuse == Call::nullHandle) return {nullptr};
+  if (call.misuse == Call::unknownHandle) return {kUntouchedPointer};
   switch (call.what) {
     case Call::setOption:
     case Call::dispatch:
@@ -105,7 +107,7 @@ Observation Client::make(const Call& call, void* handle) {
   auto& returned = observation.outcome.returned;
   switch (call.what) {
     case Call::open: {
-      const std::string name = nameOf(call);
+      const std::string name = sensorNameOf(call);
       void* session = ctx_open_session(call.misuse == Call::nullName ? nullptr : name.c_str());
       returned = session != nullptr ? 1 : 0;
       observation.opened = session;
@@ -146,7 +148,7 @@ Observation Client::make(const Call& call, void* handle) {
       returned = audio_hal_deactivate() ? 1 : 0;
       break;
     case Call::find:
-      returned = getSensor(call.misuse == Call::nullName ? nullptr : nameOf(call).c_str()) != nullptr ? 1 : 0;
+      returned = getSensor(call.misuse == Call::nullName ? nullptr : sensorNameOf(call).c_str()) != nullptr ? 1 : 0;
       break;
   }
   observePlatform(observation);
@@ -155,23 +157,24 @@ Observation Client::make(const Call& call, void* handle) {
 
 Observation Client::dispatch(const Call& call, void* handle) {
   Observation observation;
-  // A block of exactly the record's size, so that a sanitizer sees any access beyond it.
-  const std::unique_ptr<uint8_t[]> record(new uint8_t[call.record.size()]);
-  std::copy(call.record.begin(), call.record.end(), record.get());
+  // At an odd address, and at the end of its block, so that a sanitizer sees any access beyond it.
+  const std::unique_ptr<uint8_t[]> block(new uint8_t[1 + call.record.size()]);
+  uint8_t* const record = block.get() + 1;
+  std::copy(call.record.begin(), call.record.end(), record);
 
   void* result = kUntouchedPointer;
   int length = kUntouched;
   const int len = call.misuse == Call::negativeLength ? -1 : static_cast<int>(call.record.size());
-  const int returned = ctx_dispatch_data(handle, call.misuse == Call::nullData ? nullptr : record.get(), len,
+  const int returned = ctx_dispatch_data(handle, call.misuse == Call::nullData ? nullptr : record, len,
                                          call.misuse == Call::nullOut ? nullptr : &result,
                                          call.misuse == Call::nullLength ? nullptr : &length);
   observation.outcome.returned = returned;
-  if (!std::equal(call.record.begin(), call.record.end(), record.get())) {
+  if (!std::equal(call.record.begin(), call.record.end(), record)) {
     observation.complaint += "the client's record was changed; ";
   }
   if (returned != 1) {
     if (result != kUntouchedPointer || length != kUntouched) observation.complaint += "stored a result without one; ";
-  } else if (result == record.get()) {
+  } else if (result == record) {
     observation.outcome.delivers = Outcome::sameRecord;
     if (length != len) observation.complaint += "the length of the client's own record is wrong; ";
   } else if (result == kUntouchedPointer || result == nullptr || length < 0) {
@@ -263,7 +266,7 @@ void Client::restore() {
 
 Outcome makeOnModel(Model& model, const Call& call, const void* handle, const void* opened) {
   model.answers = call.answers;
-  const std::string name = nameOf(call);
+  const std::string name = sensorNameOf(call);
   const char* sensor = call.misuse == Call::nullName ? nullptr : name.c_str();
   const bool hasOut = call.misuse != Call::nullOut;
   switch (call.what) {

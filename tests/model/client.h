@@ -35,6 +35,7 @@ class Client {
   // The sessions that are open, by name, in opening order.
   const std::vector<int>& openSessions() const { return opened; }
   int sensorOf(int session) const { return sessions.at(session).sensor; }
+  void* handleOf(int session) const { return sessions.at(session).handle; }
 
   // Makes the library as it was when it was loaded, whatever the calls made of it; only getSensor() tells afterwards
   // that there were any.
