@@ -1,38 +1,38 @@
-#include "c_client.h"
-#include "client.h"
+#include <gtest/gtest.h>
+#include <senseloom.h>
 
-namespace api {
+#include <cstdint>
+#include <cstring>
+
+#include "c_client.h"
+
 namespace {
+
+// An integer or a pointer of a list's bytes.
+template <class Value>
+Value at(const void* bytes, size_t offset) {
+  Value value;
+  std::memcpy(&value, static_cast<const uint8_t*>(bytes) + offset, sizeof value);
+  return value;
+}
 
 // Whether the library writes what the header says is seen on the bytes.
 TEST(Header, ListIsACountFollowedByEntriesWithoutASentinel) {
   void* const handle = ctx_open_session("STAP");
-  const auto [result, list] = setAndKeep(handle, R"({"classMask": 2, "level": -5})");
-  ASSERT_EQ(result, 0);
+  ctx_option_t* list = nullptr;
+  ASSERT_EQ(ctx_set_option(handle, 0, R"({"classMask": 2, "level": -5})", &list), 0);
 
-  const auto* const bytes = reinterpret_cast<const uint8_t*>(list.get());
-  const auto word = [&](size_t offset) {
-    int32_t value;
-    std::memcpy(&value, bytes + offset, sizeof value);
-    return value;
-  };
   constexpr size_t kPointer = sizeof(void*);
   constexpr size_t kEntry = 8 + kPointer;
-  EXPECT_EQ(word(0), 2);
-  EXPECT_EQ(word(kPointer), 101);
-  EXPECT_EQ(word(kPointer + 4), 4);
-  EXPECT_EQ(word(kPointer + kEntry), 102);
-  EXPECT_EQ(word(kPointer + kEntry + 4), 4);
-  const auto value = [&](size_t offset) {
-    const void* pointer;
-    std::memcpy(&pointer, bytes + offset, sizeof pointer);
-    int32_t pointedAt;
-    std::memcpy(&pointedAt, pointer, sizeof pointedAt);
-    return pointedAt;
-  };
-  EXPECT_EQ(value(kPointer + 8), 2);
-  EXPECT_EQ(value(kPointer + kEntry + 8), -5);
-  EXPECT_EQ(closeSession(handle), kStopped);
+  EXPECT_EQ(at<int32_t>(list, 0), 2);
+  EXPECT_EQ(at<int32_t>(list, kPointer), 101);
+  EXPECT_EQ(at<int32_t>(list, kPointer + 4), 4);
+  EXPECT_EQ(at<int32_t>(at<const void*>(list, kPointer + 8), 0), 2);
+  EXPECT_EQ(at<int32_t>(list, kPointer + kEntry), 102);
+  EXPECT_EQ(at<int32_t>(list, kPointer + kEntry + 4), 4);
+  EXPECT_EQ(at<int32_t>(at<const void*>(list, kPointer + kEntry + 8), 0), -5);
+  EXPECT_EQ(ctx_option_release(list), 0);
+  EXPECT_EQ(ctx_close_session(handle, &list), 0);
 }
 
 TEST(Header, NullListIsReleasedWithoutHarm) {
@@ -44,4 +44,3 @@ TEST(Header, ServesAClientWrittenInC) {
 }
 
 }  // namespace
-}  // namespace api

@@ -1,9 +1,5 @@
 #include "case_file.h"
 
-#include <algorithm>
-#include <cerrno>
-#include <cstring>
-#include <fstream>
 #include <set>
 #include <string_view>
 #include <utility>
@@ -98,9 +94,7 @@ std::set<std::string_view> membersOf(Call::What what) {
 
 class CaseReader {
  public:
-  explicit CaseReader(const std::string& file) : name(file), stream(file) {
-    if (!stream) throw InputError(name + ": " + std::strerror(errno));
-  }
+  CaseReader(std::istream& is, const std::string& file) : name(file), stream(is) {}
 
   std::vector<Case> read() {
     for (std::string line; std::getline(stream, line);) {
@@ -180,7 +174,7 @@ class CaseReader {
   }
 
   const std::string name;
-  std::ifstream stream;
+  std::istream& stream;
   int lineNumber = 0;
   std::vector<Case> cases;
   std::set<std::string> names;
@@ -189,8 +183,8 @@ class CaseReader {
 
 }  // namespace
 
-std::vector<Case> readCases(const std::string& file) {
-  return CaseReader(file).read();
+std::vector<Case> readCases(std::istream& stream, const std::string& file) {
+  return CaseReader(stream, file).read();
 }
 
 }  // namespace oracle

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <istream>
 #include <string>
 #include <vector>
 
@@ -25,6 +26,6 @@ struct Case {
 };
 
 // The cases of a file. Throws InputError with the file's name and the line when one is not as it should be.
-std::vector<Case> readCases(const std::string& file);
+std::vector<Case> readCases(std::istream& stream, const std::string& file);
 
 }  // namespace oracle

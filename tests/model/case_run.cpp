@@ -11,7 +11,6 @@
 #include <vector>
 
 #include "client.h"
-#include "model.h"
 #include "sensors/option_data.h"
 #include "trace/hex.h"
 #include "trace/record_codec.h"
@@ -179,7 +178,7 @@ Json Run::logOf(const json_t* expected, const Outcome& outcome) const {
     hasNegotiation = hasNegotiation || std::string(line == nullptr ? "" : line).rfind(kNegotiationTag, 0) == 0;
   }
   Json log(json_array());
-  for (const fake::LogLine& line : outcome.log) {
+  for (const auto& line : outcome.log) {
     std::string text = letterOf(line.priority) + '/' + line.tag + ": " + line.text;
     if (!hasNegotiation && text.rfind(kNegotiationTag, 0) == 0) continue;
     for (const int session : client.openSessions()) {

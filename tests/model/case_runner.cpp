@@ -1,8 +1,11 @@
 // Runs files of cases on the built library and on the model of it.
 
+#include <cerrno>
 #include <cstdio>
 #include <cstring>
+#include <fstream>
 #include <string>
+#include <vector>
 
 #include "call.h"
 #include "case_file.h"
@@ -11,9 +14,15 @@
 
 namespace {
 
+std::vector<oracle::Case> casesOf(const char* file) {
+  std::ifstream stream(file);
+  if (!stream) throw senseloom::tool::InputError(std::string(file) + ": " + std::strerror(errno));
+  return oracle::readCases(stream, file);
+}
+
 // A case as a trace, for `senseloom replay` and `senseloom explain`.
 int printTrace(const char* file, const std::string& name) {
-  for (const oracle::Case& one : oracle::readCases(file)) {
+  for (const oracle::Case& one : casesOf(file)) {
     if (one.name != name) continue;
     oracle::Sequence sequence;
     for (const oracle::Step& step : one.steps) {
@@ -29,7 +38,7 @@ int printTrace(const char* file, const std::string& name) {
 // Returns the number of cases that failed.
 int runFile(const char* file) {
   int failed = 0;
-  const auto cases = oracle::readCases(file);
+  const auto cases = casesOf(file);
   for (const oracle::Case& one : cases) {
     const std::string text = oracle::run(one, file);
     if (text.empty()) continue;

@@ -183,6 +183,8 @@ Observation Client::dispatch(const Call& call, void* handle) {
     observation.outcome.delivers = Outcome::ownBuffer;
     const auto* bytes = static_cast<const uint8_t*>(result);
     observation.outcome.result.assign(bytes, bytes + length);
+    const auto isOthers = [&](const auto& other) { return other.first != handle && other.second == result; };
+    if (std::any_of(buffers.begin(), buffers.end(), isOthers)) observation.complaint += "the buffer is another's; ";
     const void*& buffer = buffers[handle];
     if (buffer != nullptr && buffer != result) observation.complaint += "the session's buffer has moved; ";
     buffer = result;
@@ -223,6 +225,7 @@ void Client::noteClosed(const Call& call, const void* handle) {
     if (!session.isOpen || !isMeant) continue;
     session.isOpen = false;
     std::erase(opened, name);
+    buffers.erase(handle);
     return;
   }
 }
