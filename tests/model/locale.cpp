@@ -13,6 +13,7 @@ namespace {
     std::fputs("there is no locale with a decimal comma in the environment\n", stderr);
     std::exit(2);
   }
+  std::setlocale(LC_MESSAGES, "C");  // expected texts are in English
 }
 
 }  // namespace
