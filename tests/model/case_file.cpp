@@ -58,7 +58,7 @@ Json expanded(json_t* value) {
 }
 
 // A word that is mistyped must not leave out what it was to check.
-void checkMembers(json_t* object, std::set<std::string_view> known) {
+void checkMembers(json_t* object, const std::set<std::string_view>& known) {
   const char* key;
   json_t* value;
   json_object_foreach(object, key, value) {
