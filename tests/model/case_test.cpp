@@ -249,30 +249,29 @@ TEST(CaseRun, OverlooksNothing) {
   }
 }
 
+// The opening of a gesture session, and the beginning of a dispatch whose log is as expected.
+const std::string kOpenGestures =
+    R"({"call":"open","session":"a","sensor":"GSPX","returned":"handle","platformCalls":["gesture_initial"]})"
+    "\n";
+const std::string kFeed =
+    R"({"call":"dispatch","session":"a","record":{"timestamp":1,"prx":0,"samples":[[1,2,3,4,5,6]]},)"
+    R"("log":["D/libsenseloom: num 0: 1 2 3 4 5 6: last 1, size 12, prx 0\n")";
+
 TEST(CaseRun, ComparesWhatTheEngineIsFed) {
-  const std::string open = R"({"call":"open","session":"a","sensor":"GSPX","returned":"handle",)"
-                           R"("platformCalls":["gesture_initial"]})"
-                           "\n";
-  const std::string dispatch =
-      R"({"call":"dispatch","session":"a","record":{"timestamp":1,"prx":0,"samples":[[1,2,3,4,5,6]]},"returned":0,)"
-      R"("log":["D/libsenseloom: num 0: 1 2 3 4 5 6: last 1, size 12, prx 0\n"])";
-  EXPECT_EQ(ran(open + dispatch + R"(,"groups":[[1,2,3,4,5,6]]})"), "");
-  EXPECT_NE(ran(open + dispatch + R"(,"groups":[[1,2,3,4,5,7]]})").find("library: \"groups\""), std::string::npos);
-  EXPECT_NE(ran(open + dispatch + "}").find("library: \"groups\""), std::string::npos);
+  const std::string dropped = kOpenGestures + kFeed + R"(],"returned":0)";
+  EXPECT_EQ(ran(dropped + R"(,"groups":[[1,2,3,4,5,6]]})"), "");
+  EXPECT_NE(ran(dropped + R"(,"groups":[[1,2,3,4,5,7]]})").find("library: \"groups\""), std::string::npos);
+  EXPECT_NE(ran(dropped + "}").find("library: \"groups\""), std::string::npos);
 }
 
 // The class is one field of such a result: the record's samples have to be there, too.
 TEST(CaseRun, ComparesTheWholeResultOfAGesture) {
-  const std::string open = R"({"call":"open","session":"a","sensor":"GSPX","returned":"handle",)"
-                           R"("platformCalls":["gesture_initial"]})"
-                           "\n";
-  const std::string dispatch =
-      R"({"call":"dispatch","session":"a","record":{"timestamp":1,"prx":0,"samples":[[1,2,3,4,5,6]]},"returned":1,)"
-      R"("platform":{"names":["LetterA "]},"groups":[[1,2,3,4,5,6]],)"
-      R"("log":["D/libsenseloom: num 0: 1 2 3 4 5 6: last 1, size 12, prx 0\n","D/libsenseloom: -- gesture: LetterA "],)";
-  EXPECT_EQ(ran(open + dispatch + R"("result":{"timestamp":1,"class":11}})"), "");
-  EXPECT_NE(ran(open + dispatch + R"("result":{"timestamp":1,"class":12}})"), "");
-  EXPECT_NE(ran(open + dispatch + R"("result":{"timestamp":2,"class":11}})"), "");
+  const std::string delivered = kOpenGestures + kFeed +
+                                R"(,"D/libsenseloom: -- gesture: LetterA "],"platform":{"names":["LetterA "]},)"
+                                R"("groups":[[1,2,3,4,5,6]],"returned":1,"result":)";
+  EXPECT_EQ(ran(delivered + R"({"timestamp":1,"class":11}})"), "");
+  EXPECT_NE(ran(delivered + R"({"timestamp":1,"class":12}})"), "");
+  EXPECT_NE(ran(delivered + R"({"timestamp":2,"class":11}})"), "");
 }
 
 TEST(CaseRun, WantsSessionsOpenedOnceAndClosedBeforeTheirHandlesAreStale) {
