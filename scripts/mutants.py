@@ -13,7 +13,7 @@ A mutant is named by its file, the changed line as it is, and as it becomes; by 
 A mutant is built like the product for the host's word size, with the C++ library's checks of bounds on top. When the
 shared library comes out the same to the byte, no test could tell, and the mutant does not count; neither does one that
 does not compile, nor one that is listed, with its reason, in mutants-equivalent.txt. The others are killed by any test of behaviour that fails, crashes or does not end:
-those of tests/api first, which need no linking, then those of the file's folder, then the rest. Nothing is random:
+the cases and the tests of tests/api first, which need no linking, then those of the file's folder, then the rest. Nothing is random:
 addresses and the seed of the tests are fixed.
 """
 
@@ -232,8 +232,8 @@ def adapted(file, text):
 class Program:
     """A test program."""
 
-    def __init__(self, folder, name, shared):
-        self.folder, self.name, self.shared = folder, name, shared
+    def __init__(self, folder, name, shared, arguments=("--gtest_fail_fast",)):
+        self.folder, self.name, self.shared, self.arguments = folder, name, shared, arguments
         self.filters = ["*"]  # each for a run of its own
         self.seconds = 0.0
 
@@ -246,6 +246,7 @@ def test_programs():
             text = lists.read_text(encoding="utf-8")
             for kind, name in re.findall(r"^senseloom_(\w*)test\(\s*(\w+)", text, re.MULTILINE):
                 programs.append(Program(lists.parent.name, name, kind == "api_"))
+    programs.append(Program("api", "case_runner", True, sorted((ROOT / "tests" / "cases").glob("*.jsonl"))))
     return programs
 
 
@@ -290,8 +291,9 @@ class Copy:
 
     def passes(self, program, only, timeout):
         """Whether the tests that a filter tells pass in time."""
-        command = ["setarch", "--addr-no-randomize", self.build / "bin" / program.name, "--gtest_fail_fast",
-                   "--gtest_filter=" + only]
+        command = ["setarch", "--addr-no-randomize", self.build / "bin" / program.name, *program.arguments]
+        if only != "*":
+            command.append("--gtest_filter=" + only)
         try:
             return subprocess.run(command, cwd=self.runs, env={**os.environ, "SENSELOOM_TEST_SEED": "1"},
                                   timeout=timeout, stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL,
