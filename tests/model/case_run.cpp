@@ -56,19 +56,25 @@ Json rawProperties(const PropertyList& list) {
   return array;
 }
 
+constexpr int32_t kSpans = 43;
+constexpr int32_t kTemplateNumber = 122;
+constexpr int32_t kTemplateBytes = 123;
+
 Json valueOf(const Property& property) {
   if (property.value.size() != sizeof(int32_t)) return textJson(hexOf(property.value));
   int32_t value;
   std::memcpy(&value, property.value.data(), sizeof value);
+  if (property.id == kSpans) return Json(json_pack("[i,i]", value >> 16 & 0xFFFF, value & 0xFFFF));
   return Json(json_integer(value));
 }
 
-// By name. A template's number and its bytes are one member: "template1" or "template2".
+// By name. Two spans in one value are shown apart. A template's number and its bytes are one member, "template1" or
+// "template2".
 Json namedProperties(int sensor, const PropertyList& list) {
   Json object(json_object());
   for (const Property& property : list) {
-    if (property.id == 122) continue;
-    const bool isTemplate = property.id == 123;
+    if (property.id == kTemplateNumber) continue;
+    const bool isTemplate = property.id == kTemplateBytes;
     const std::string name = isTemplate ? "template" + std::to_string(property.slot + 1)
                                         : senseloom::tool::propertyName(kSensorNames[sensor], property.id);
     addMember(object, name.c_str(), isTemplate ? textJson(hexOf(property.value)) : valueOf(property));
