@@ -1,3 +1,4 @@
+#include <fake_platform.h>
 #include <gtest/gtest.h>
 #include <senseloom.h>
 
@@ -13,7 +14,7 @@
 #include "generator.h"
 #include "held_lists.h"
 #include "library_memory.h"
-#include "model.h"
+#include "model/model.h"
 
 // Every call of a scenario is made with its first, its second, ... allocation failing, until it succeeds: with that one
 // failing alone and with all from that one on, made again afterwards and not. It has to return its failure value, and

@@ -1,36 +1,32 @@
 #pragma once
 
-#include <cstdint>
+#include <array>
+#include <cstddef>
 #include <optional>
 #include <string>
 #include <utility>
 #include <vector>
 
+#include "model/kinds.h"
+#include "model/outcome.h"
+
 // The calls of a client as data: made up at random, made on the library and on the model of it, shrunk, and written as
 // a trace.
 namespace oracle {
 
-using Bytes = std::vector<uint8_t>;
+namespace model = senseloom::model;
+
+using model::Answers;
+using model::Bytes;
 
 // The sensors in the library's order; a call names one by its place here.
-constexpr int kSensors = 12;
-enum Kind { phyac, stap, gsflk, shaki, isact, scoun, gspx, dtwgs, gseth, lpe, pdr, lift };
-constexpr const char* kSensorNames[kSensors] = {"PHYAC", "STAP",  "GSFLK", "SHAKI", "ISACT", "SCOUN",
-                                                "GSPX",  "DTWGS", "GSETH", "LPE_P", "PDR",   "LIFT"};
-
-// What the platform answers during a call.
-struct Answers {
-  int get = 0;        // the loader
-  int open = 0;       // the module
-  bool gives = true;  // whether a successful open gives a device
-  uint32_t version = 0x200;
-  int activate = 0;
-  int deactivate = 0;
-  bool starts = true;                             // the gesture engine
-  std::vector<std::optional<std::string>> names;  // its answers to the groups of samples; none left: no gesture
-
-  bool operator==(const Answers&) const = default;
-};
+using enum model::Kind;
+constexpr int kSensors = model::kKinds;
+constexpr auto kSensorNames = [] {
+  std::array<const char*, kSensors> names{};
+  for (size_t i = 0; i < names.size(); ++i) names[i] = model::kKindTable[i].sensor;
+  return names;
+}();
 
 // An option string: members with their values as JSON text, or text as it stands, or a null pointer.
 struct OptionText {

@@ -195,9 +195,11 @@ Observation Client::dispatch(const Call& call, void* handle) {
 void Client::observePlatform(Observation& observation) {
   auto& platform = fake::platform();
   Outcome& outcome = observation.outcome;
-  outcome.log = platform.takeLog();
+  for (const auto& [priority, tag, text] : platform.takeLog()) outcome.log.push_back({priority, tag, text});
   outcome.calls = std::exchange(platform.calls, {});
-  outcome.groups = std::exchange(platform.groups, {});
+  for (const auto& [samples, count, last] : std::exchange(platform.groups, {})) {
+    outcome.groups.push_back({samples, count, last});
+  }
   outcome.engineStarts = static_cast<int>(platform.gestureInitials.size());
   outcome.engineCloses = std::exchange(platform.gestureCloses, 0);
   for (const auto& arguments : std::exchange(platform.gestureInitials, {})) {
@@ -314,10 +316,10 @@ std::string words(bool yes) {
 std::string words(const std::string& text) {
   return text;
 }
-std::string words(const fake::LogLine& line) {
+std::string words(const model::LogLine& line) {
   return std::to_string(line.priority) + ' ' + line.tag + ": \"" + line.text + '"';
 }
-std::string words(const fake::Platform::Group& group) {
+std::string words(const model::SampleGroup& group) {
   std::string text = std::to_string(group.count) + (group.last ? " last:" : ":");
   for (const int16_t sample : group.samples) text += ' ' + std::to_string(sample);
   return text;

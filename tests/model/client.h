@@ -7,10 +7,17 @@
 #include <vector>
 
 #include "call.h"
-#include "model.h"
+#include "model/model.h"
 
 // Both sides of a comparison: a client of the library, and the model in the same place.
 namespace oracle {
+
+using model::Mistake;
+using model::Model;
+using model::Outcome;
+using model::Property;
+using model::PropertyList;
+using model::Shortage;
 
 // What came of one call of the library. What `complaint` tells is wrong whatever was to be expected.
 struct Observation {

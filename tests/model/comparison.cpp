@@ -1,5 +1,7 @@
 #include "comparison.h"
 
+#include <fake_platform.h>
+
 #include <utility>
 
 #include "held_lists.h"

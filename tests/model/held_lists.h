@@ -4,7 +4,7 @@
 #include <string>
 
 #include "client.h"
-#include "model.h"
+#include "model/model.h"
 
 namespace oracle {
 

@@ -30,7 +30,10 @@ class Explaining {
                          .returned = returned,
                          .properties = std::move(properties)});
   }
-  void dispatch(const std::vector<uint8_t>& record, int returned) {
+  // What is delivered is the record itself, but for what the test says.
+  void dispatch(const std::vector<uint8_t>& record, int returned) { dispatch(record, returned, record); }
+  void dispatch(const std::vector<uint8_t>& record, int returned, const std::vector<uint8_t>& delivered) {
+    const auto result = returned == 1 ? std::optional<std::span<const uint8_t>>(delivered) : std::nullopt;
     explainer.onOutcome({.call = callOf(CallKind::dispatch),
                          .session = name,
                          .sensor = layout,

@@ -24,11 +24,11 @@ void printAccounts(std::FILE* out, const std::vector<Account>& accounts) {
     rows[0].push_back(title);
     for (size_t i = 0; i < accounts.size(); ++i) rows[1 + i].push_back(std::to_string(count(accounts[i])));
   };
-  for (size_t fate = 0; fate < kFates; ++fate) {
+  for (size_t fate = 0; fate < model::kFates; ++fate) {
     const auto count = [fate](const Account& account) { return account.fates[fate]; };
-    if (fate == static_cast<size_t>(Fate::delivered) ||
+    if (fate == static_cast<size_t>(model::Fate::delivered) ||
         any([&](const Account& account) { return count(account) > 0; })) {
-      addColumn(fateText(static_cast<Fate>(fate)), count);
+      addColumn(model::fateText(static_cast<model::Fate>(fate)), count);
     }
   }
   const auto unexplained = [](const Account& account) { return account.unexplained; };

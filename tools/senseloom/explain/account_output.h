@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-#include "explain/verdict.h"
+#include "model/reasons.h"
 #include "trace/record_codec.h"
 
 namespace senseloom::tool {
@@ -15,7 +15,7 @@ namespace senseloom::tool {
 struct Account {
   std::string session;
   const RecordLayout* sensor;
-  std::array<size_t, kFates> fates{};  // by fate
+  std::array<size_t, model::kFates> fates{};  // by fate
   size_t unexplained = 0;
   std::string chain = {};  // of stages, as it was last built; empty: none
 

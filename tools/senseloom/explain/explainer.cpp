@@ -5,22 +5,30 @@
 #include <utility>
 
 #include "explain/negotiation_output.h"
+#include "explain/platform_answers.h"
 
 namespace senseloom::tool {
 namespace {
 
 // Lines that tell that a negotiation takes place, which is no news here.
 constexpr std::string_view kNegotiationTag = "Libsl";
+// The platform's log cuts what is longer.
+constexpr size_t kMostLogged = 1023;
 
-bool isActivity(const RecordLayout& sensor) {
-  return std::string_view(sensor.sensor) == "PHYAC";
+// Whether the library delivered for a record what the model does.
+bool isDelivered(const CallOutcome& outcome, const model::Outcome& expected) {
+  if (expected.delivers == model::Outcome::nothing) return true;
+  const std::span<const uint8_t> wanted =
+      expected.delivers == model::Outcome::sameRecord ? outcome.record : std::span<const uint8_t>(expected.result);
+  return outcome.result && std::equal(wanted.begin(), wanted.end(), outcome.result->begin(), outcome.result->end());
 }
 
 }  // namespace
 
 void Explainer::onOutcome(const CallOutcome& outcome) {
   log = library.take();
-  std::erase_if(log, [](const LogLine& line) { return line.tag == kNegotiationTag; });
+  std::erase_if(log, [](const model::LogLine& line) { return line.tag == kNegotiationTag; });
+  model.answers = answersToldBy(log);
   switch (outcome.call.kind) {
     case CallKind::open:
       open(outcome);
@@ -35,7 +43,7 @@ void Explainer::onOutcome(const CallOutcome& outcome) {
       close(outcome);
       break;
     case CallKind::uninit:
-      for (Session& session : sessions) session.isForeign = true;
+      model.uninit();
       break;
   }
 }
@@ -45,32 +53,38 @@ void Explainer::onEnd() {
 }
 
 void Explainer::open(const CallOutcome& outcome) {
-  accountOf(outcome);
-  if (outcome.failed) {
-    printBlock(outcome, "does not open");
-    printRestOfLog();
+  Account& account = accountOf(outcome.session, outcome.sensor);
+  const Session& session = sessions.emplace_back(Session{outcome.session, outcome.sensor});
+  const bool isExpected = model.open(outcome.sensor->sensor, &session).returned == 1;
+  if (!outcome.failed) {
+    account.chain = model.chain(&session);
+    if (!isExpected) printBlock(outcome, "unexplained: opens, where no session was derived");
     return;
   }
-  sessions.push_back({.name = outcome.session,
-                      .sensor = outcome.sensor,
-                      .wishes = Wishes(*findOptionDescription(outcome.sensor->sensor)),
-                      .model = makeSessionModel(*outcome.sensor, gestures)});
+  printBlock(outcome, "does not open");
+  if (isExpected) {
+    std::fputs("  unexplained: the library opened no session, where one was derived\n", out);
+    model.close(&session, true);
+  }
+  sessions.pop_back();
+  printRestOfLog();
 }
 
 void Explainer::setOption(const CallOutcome& outcome) {
   const auto session = find(outcome.session);
-  printBlock(outcome, "sets " + outcome.call.option.value_or("a null pointer"));
+  const auto& text = outcome.call.option;
+  printBlock(outcome, "sets " + text.value_or("a null pointer"));
   if (session == sessions.end()) {
     std::fputs("  refused: the session did not open\n", out);
     return;
   }
-  OptionReading reading = readOption(session->wishes.kind(), outcome.call.option, templates);
-  printRemarks(reading.remarks);
-  if (reading.wishes) session->wishes = *std::move(reading.wishes);
-  if (reading.accepted) {
-    negotiate(outcome, *session);
+  const model::Outcome expected = model.setOption(&*session, text ? text->c_str() : nullptr, true);
+  printRemarks(expected.why.remarks);
+  if (expected.why.negotiation) {
+    noteRestarts(*expected.why.negotiation, false);
+    printNegotiation(outcome, expected);
   } else {
-    checkReturn(outcome, -1);
+    checkReturn(outcome, expected);
     if (outcome.failed) std::fputs("  refused: nothing changes\n", out);
   }
   printRestOfLog();
@@ -78,13 +92,24 @@ void Explainer::setOption(const CallOutcome& outcome) {
 
 void Explainer::dispatch(const CallOutcome& outcome) {
   const auto session = find(outcome.session);
-  const Verdict verdict =
-      session == sessions.end() ? Verdict{Fate::refused} : session->model->judge(session->wishes, outcome.record, log);
-  Account& account = accountOf(outcome);
+  model::Outcome expected;
+  if (session != sessions.end()) {
+    const uint8_t nothing = 0;  // a record of no bytes has an address, too
+    expected = model.dispatch(&*session, outcome.record.empty() ? &nothing : outcome.record.data(),
+                              static_cast<int>(outcome.record.size()), true, true);
+    session->items += expected.why.items;
+  }
+  const model::Verdict& verdict = expected.why.verdict;
+  Account& account = accountOf(outcome.session, outcome.sensor);
   if (verdict.returned() != outcome.returned) {
     ++account.unexplained;
     printLine(outcome, "unexplained: the library returned " + std::to_string(outcome.returned) +
                            ", where this was derived: " + verdict.text());
+    return;
+  }
+  if (!isDelivered(outcome, expected)) {
+    ++account.unexplained;
+    printLine(outcome, "unexplained: the library delivered other bytes than were derived");
     return;
   }
   ++account.fates[static_cast<size_t>(verdict.fate)];
@@ -95,53 +120,60 @@ void Explainer::close(const CallOutcome& outcome) {
   const auto closing = find(outcome.session);
   // At the end of the trace sessions are closed by the tool, which is no news but for what they made of the records.
   const bool isAtEnd = outcome.call.line == 0;
-  const std::string account = closing == sessions.end() ? "" : closing->model->account();
-  if (!isAtEnd || !account.empty()) printBlock(outcome, isAtEnd ? "is open at the end" : "leaves");
-  if (!account.empty()) std::fprintf(out, "  %s\n", account.c_str());
-  if (closing == sessions.end()) return;
-  accountOf(outcome).chain = closing->model->chain();
-  const Session closed = std::move(*closing);
+  if (closing == sessions.end()) {
+    if (!isAtEnd) printBlock(outcome, "leaves");
+    return;
+  }
+  const model::Outcome expected = model.close(&*closing, true);
+  closing->items += expected.why.items;
+  const std::string account = closing->items.text();
   sessions.erase(closing);
-  const auto first = std::find_if(sessions.begin(), sessions.end(), [&closed](const Session& session) {
-    return session.sensor == closed.sensor && !session.isForeign;
-  });
-  if (first != sessions.end() && !isAtEnd) negotiate(outcome, *first);
+  if (!isAtEnd || !account.empty() || outcome.returned != expected.returned) {
+    printBlock(outcome, isAtEnd ? "is open at the end" : "leaves");
+  }
+  if (!account.empty()) std::fprintf(out, "  %s\n", account.c_str());
+  if (expected.why.negotiation) noteRestarts(*expected.why.negotiation, isAtEnd);
+  if (expected.why.negotiation && !isAtEnd) {
+    printNegotiation(outcome, expected);
+  } else {
+    checkReturn(outcome, expected);
+  }
   if (!isAtEnd) printRestOfLog();
 }
 
-void Explainer::negotiate(const CallOutcome& outcome, const Session& starter) {
-  std::vector<Participant> participants;
-  size_t starterIndex = 0;
-  for (const Session& session : sessions) {
-    if (&session != &starter && (session.isForeign || session.sensor != starter.sensor)) continue;
-    if (&session == &starter) starterIndex = participants.size();
-    participants.push_back({session.name, &session.wishes});
+void Explainer::printNegotiation(const CallOutcome& outcome, const model::Outcome& expected) {
+  const model::Negotiation& negotiation = *expected.why.negotiation;
+  std::vector<std::string> names;
+  for (const auto& participant : negotiation.participants) {
+    names.push_back(static_cast<const Session*>(participant.handle)->name);
   }
-  const MergeDerivation derivation = deriveMerge(participants, starterIndex, starter.isForeign, templates);
-  printNegotiation(out, participants, derivation, outcome.properties);
-  if (!derivation.logged.empty()) printRemarks({{"no property list: " + derivation.conflict, derivation.logged}});
-
-  const bool isClose = outcome.call.kind == CallKind::close;
-  const int success = isClose ? 1 : 0;
-  checkReturn(outcome, derivation.properties || isClose ? success : -1);
-  if (isActivity(*starter.sensor)) restartSessions(*starter.sensor, *derivation.keys[2].value);
+  tool::printNegotiation(out, negotiation, names, expected.list, outcome.properties);
+  if (negotiation.conflict) printRemarks({*negotiation.conflict});
+  checkReturn(outcome, expected);
+  for (size_t i = 0; i < names.size(); ++i) {
+    const std::string& chain = negotiation.participants[i].chain;
+    if (!chain.empty()) std::fprintf(out, "  chain of %s: %s\n", names[i].c_str(), chain.c_str());
+  }
 }
 
-void Explainer::restartSessions(const RecordLayout& sensor, int32_t leastLogM) {
+void Explainer::noteRestarts(const model::Negotiation& negotiation, bool isAtEnd) {
   for (Session& session : sessions) {
-    if (session.sensor != &sensor || session.isForeign) continue;
-    session.model->restart(session.wishes, leastLogM);
-    std::fprintf(out, "  chain of %s: %s\n", session.name.c_str(), session.model->chain().c_str());
+    const auto restarted = std::find_if(negotiation.participants.begin(), negotiation.participants.end(),
+                                        [&session](auto& participant) { return participant.handle == &session; });
+    if (restarted == negotiation.participants.end() || restarted->chain.empty()) continue;
+    session.items.cutOff += restarted->cutOff;
+    if (!isAtEnd) accountOf(session.name, session.sensor).chain = restarted->chain;
   }
 }
 
-void Explainer::checkReturn(const CallOutcome& outcome, int expected) {
-  if (outcome.returned == expected) return;
-  std::fprintf(out, "  unexplained: the library returned %d, where %d was derived\n", outcome.returned, expected);
+void Explainer::checkReturn(const CallOutcome& outcome, const model::Outcome& expected) {
+  if (outcome.returned == expected.returned) return;
+  std::fprintf(out, "  unexplained: the library returned %d, where %d was derived\n", outcome.returned,
+               expected.returned);
 }
 
-void Explainer::printRemarks(const std::vector<Remark>& remarks) {
-  for (const Remark& remark : remarks) {
+void Explainer::printRemarks(const std::vector<model::Remark>& remarks) {
+  for (const model::Remark& remark : remarks) {
     std::fprintf(out, "  %s\n", remark.text.c_str());
     if (remark.logged.empty()) continue;
     if (takeLogged(remark.logged)) {
@@ -153,14 +185,19 @@ void Explainer::printRemarks(const std::vector<Remark>& remarks) {
 }
 
 bool Explainer::takeLogged(const std::string& text) {
-  const auto found = std::find_if(log.begin(), log.end(), [&text](const LogLine& line) { return line.text == text; });
+  const auto found = std::find_if(log.begin(), log.end(), [&text](const model::LogLine& line) {
+    return line.text == text || line.text == text.substr(0, kMostLogged);
+  });
   if (found == log.end()) return false;
   log.erase(found);
   return true;
 }
 
 void Explainer::printRestOfLog() {
-  for (const LogLine& line : log) std::fprintf(out, "  logged: %s: %s\n", line.tag.c_str(), line.text.c_str());
+  for (const model::LogLine& line : log) {
+    const size_t end = line.text.find_last_not_of('\n');
+    std::fprintf(out, "  logged: %s: %s\n", line.tag.c_str(), line.text.substr(0, end + 1).c_str());
+  }
 }
 
 void Explainer::printBlock(const CallOutcome& outcome, const std::string& what) {
@@ -174,12 +211,12 @@ void Explainer::printLine(const CallOutcome& outcome, const std::string& what) {
   std::fprintf(out, "%s on %s %s\n", outcome.session.c_str(), outcome.sensor->sensor, what.c_str());
 }
 
-Account& Explainer::accountOf(const CallOutcome& outcome) {
-  const auto known = std::find_if(accounts.begin(), accounts.end(), [&outcome](const Account& account) {
-    return account.session == outcome.session && account.sensor == outcome.sensor;
+Account& Explainer::accountOf(const std::string& session, const RecordLayout* sensor) {
+  const auto known = std::find_if(accounts.begin(), accounts.end(), [&](const Account& account) {
+    return account.session == session && account.sensor == sensor;
   });
   if (known != accounts.end()) return *known;
-  return accounts.emplace_back(Account{.session = outcome.session, .sensor = outcome.sensor});
+  return accounts.emplace_back(Account{.session = session, .sensor = sensor});
 }
 
 Explainer::SessionIterator Explainer::find(const std::string& name) {

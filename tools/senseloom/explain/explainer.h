@@ -1,71 +1,68 @@
 #pragma once
 
 #include <cstdio>
-#include <memory>
-#include <optional>
+#include <list>
 #include <string>
 #include <vector>
 
 #include "explain/account_output.h"
-#include "explain/gesture_model.h"
 #include "explain/log_capture.h"
-#include "explain/merge_derivation.h"
-#include "explain/option_reading.h"
-#include "explain/session_model.h"
+#include "model/model.h"
 #include "replay/replayer.h"
 
 namespace senseloom::tool {
 
 // Prints why: for each negotiation what every session asked for, what was rejected, and who decided; for each session
-// what became of its records. The reasons are derived beside the library, from the options and the records. Where the
-// library did otherwise it says so: "unexplained".
+// what became of its records. The reasons are those of the model, which is given the same calls. Where the library did
+// something else, it says so: "unexplained".
 class Explainer final : public ReplayObserver {
  public:
-  // Prints what became of each record, too, if `withRecords` is set. `capture` is where the library's log goes.
-  Explainer(std::FILE* stream, LogCapture& capture, bool withRecords)
-      : out(stream), library(capture), records(withRecords) {}
+  // Prints what became of each record, too, if `withRecords` is set. `source` is where the library's log goes.
+  Explainer(std::FILE* stream, LogSource& source, bool withRecords)
+      : out(stream), library(source), records(withRecords) {
+    model.explains = true;
+  }
   void onOutcome(const CallOutcome& outcome) override;
   void onEnd() override;
 
  private:
+  // Its address is its handle in the model.
   struct Session {
     std::string name;
     const RecordLayout* sensor;
-    Wishes wishes;
-    std::unique_ptr<SessionModel> model;
-    bool isForeign = false;  // its sensor went with an uninit: it negotiates with nobody
+    model::ItemCounts items = {};
   };
-  using SessionIterator = std::vector<Session>::iterator;
+  using SessionIterator = std::list<Session>::iterator;
 
   void open(const CallOutcome& outcome);
   void setOption(const CallOutcome& outcome);
   void dispatch(const CallOutcome& outcome);
   void close(const CallOutcome& outcome);
 
-  // Explains the negotiation that begins with the wishes of `starter`.
-  void negotiate(const CallOutcome& outcome, const Session& starter);
-  void restartSessions(const RecordLayout& sensor, int32_t leastLogM);
-  void checkReturn(const CallOutcome& outcome, int expected);
+  void printNegotiation(const CallOutcome& outcome, const model::Outcome& expected);
+  // Notes what a negotiation makes of the sessions that start over. What they go on with at the end of the trace, while
+  // it is the tool that closes one after the other, is no news.
+  void noteRestarts(const model::Negotiation& negotiation, bool isAtEnd);
+  void checkReturn(const CallOutcome& outcome, const model::Outcome& expected);
   // Prints what is told of an option, each with what the library logged about it.
-  void printRemarks(const std::vector<Remark>& remarks);
+  void printRemarks(const std::vector<model::Remark>& remarks);
   // The log line of that text, for which it is taken as explained; false when there is none.
   bool takeLogged(const std::string& text);
   void printRestOfLog();
   // A block of several lines, apart from what is before it.
   void printBlock(const CallOutcome& outcome, const std::string& what);
   void printLine(const CallOutcome& outcome, const std::string& what);
-  Account& accountOf(const CallOutcome& outcome);
+  Account& accountOf(const std::string& session, const RecordLayout* sensor);
   SessionIterator find(const std::string& name);
 
   std::FILE* out;
-  LogCapture& library;
+  LogSource& library;
   bool records;
-  bool begun = false;             // something was printed
-  std::vector<LogLine> log;       // of the call, but for what was explained
-  std::vector<Session> sessions;  // in opening order
+  bool begun = false;           // something was printed
+  model::Log log;               // of the call, but for what was explained
+  model::Model model;           // what the library should do
+  std::list<Session> sessions;  // those that are open, in opening order
   std::vector<Account> accounts;
-  TemplateLengths templates{};
-  GestureState gestures;
 };
 
 }  // namespace senseloom::tool

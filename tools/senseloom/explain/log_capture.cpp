@@ -8,12 +8,10 @@ namespace senseloom::tool {
 namespace {
 
 // The logger is a plain function and knows of no object.
-std::vector<LogLine> lines;
+model::Log lines;
 
 void keep(const __android_logger_data* data, const char* message) {
-  std::string text = message;
-  while (!text.empty() && text.back() == '\n') text.pop_back();
-  lines.push_back({data->priority, data->tag == nullptr ? "" : data->tag, std::move(text)});
+  lines.push_back({data->priority, data->tag == nullptr ? "" : data->tag, message});
 }
 
 }  // namespace
@@ -28,7 +26,7 @@ LogCapture::~LogCapture() {
   lines.clear();
 }
 
-std::vector<LogLine> LogCapture::take() {
+model::Log LogCapture::take() {
   return std::exchange(lines, {});
 }
 

@@ -1,10 +1,10 @@
-#include "explain/nearest_name.h"
+#include "nearest_name.h"
 
 #include <algorithm>
 #include <numeric>
 #include <utility>
 
-namespace senseloom::tool {
+namespace senseloom::model {
 
 size_t editDistance(std::string_view from, std::string_view to) {
   // One row of the table of distances: [j] is that of what was seen of `from` to the first j characters of `to`.
@@ -28,4 +28,4 @@ std::string_view nearestName(std::string_view name, const std::vector<std::strin
   return nearest == names.end() ? std::string_view() : *nearest;
 }
 
-}  // namespace senseloom::tool
+}  // namespace senseloom::model

@@ -1,0 +1,252 @@
+#pragma once
+
+#include <array>
+#include <cstddef>
+#include <cstdint>
+#include <initializer_list>
+#include <limits>
+#include <string_view>
+
+// What is data about the twelve sensors: a table of the model's own, which shares nothing with the library.
+namespace senseloom::model {
+
+// The sensors in the library's order.
+enum Kind { phyac, stap, gsflk, shaki, isact, scoun, gspx, dtwgs, gseth, lpe, pdr, lift };
+inline constexpr int kKinds = lift + 1;
+
+// What becomes of a value out of its key's range.
+enum class OutOfRange {
+  replaced,  // by the key's fallback
+  clamped,   // to the nearer bound
+  kept,      // the kind's own code deals with it
+};
+
+// How the values of several sessions become one.
+enum class Rule {
+  bitOr,
+  minimum,
+  maximum,
+  allOne,     // 1 when all are 1, else 0
+  anySet,     // 1 when any is not 0, else 0
+  keepFirst,  // that of the session which the merge starts from
+  takeLast,   // that of the session opened last
+};
+
+// What decides whether a session delivers a record.
+enum class Judging {
+  nothing,        // it delivers all
+  classSet,       // the mask has one of the 16-bit set's bits
+  classNumber16,  // the mask has the bit of the class with that number, from 1
+  classNumber32,
+  stepMultiples,  // the number of steps is a multiple, where that is asked for
+  activity,       // batches, votes, masks and changes
+  gestures,       // what the gesture engine recognises in it
+  gathering,      // there are enough items
+};
+
+// An integer key of an option string.
+struct Key {
+  const char* name;
+  int32_t defaultValue = 0;
+  int32_t low = std::numeric_limits<int32_t>::min();  // of its range; above `high`: no value is in range
+  int32_t high = std::numeric_limits<int32_t>::max();
+  OutOfRange outOfRange = OutOfRange::replaced;
+  int32_t fallback = defaultValue;
+  const char* message = nullptr;  // format of the line logged about a value out of range; null: none
+  Rule merge = Rule::keepFirst;
+
+  constexpr bool takes(int32_t value) const { return low <= value && value <= high; }
+};
+
+// An entry of a property list.
+struct PropertyRow {
+  int32_t id;
+  const char* name;
+  const char* key = nullptr;  // whose value it shows; null: the value is computed
+};
+
+struct KindRow {
+  const char* sensor;
+  std::initializer_list<Key> keys;
+  std::initializer_list<const char*> stringKeys = {};
+  std::initializer_list<PropertyRow> properties = {};
+  Judging judging = Judging::nothing;
+  const char* tag = "libsenseloom";
+  const char* notJson = nullptr;  // format of the line logged about text that is not JSON; null: none
+  bool acceptsNotJson = false;    // such a text changes nothing, but the sensor negotiates
+};
+
+inline constexpr KindRow kKindTable[kKinds] = {
+    {.sensor = "PHYAC",
+     .keys = {{.name = "mode", .merge = Rule::allOne},
+              {.name = "logN", .low = 0, .high = 8, .outOfRange = OutOfRange::clamped, .merge = Rule::minimum},
+              {.name = "logM", .low = 0, .high = 8, .outOfRange = OutOfRange::clamped, .merge = Rule::minimum},
+              {.name = "classMask", .defaultValue = -1, .low = -1, .high = 255, .merge = Rule::bitOr},
+              {.name = "summary", .defaultValue = 1, .low = 0, .high = 1},
+              {.name = "weightVar", .defaultValue = -1, .low = 0},
+              {.name = "continuous", .low = 0, .high = 1, .fallback = 1, .merge = Rule::anySet}},
+     .properties = {{41, "mode", "mode"}, {43, "spans"}, {44, "decisionsPerSpan"}, {42, "classMask", "classMask"}},
+     .judging = Judging::activity},
+    {.sensor = "STAP",
+     .keys = {{.name = "classMask",
+               .defaultValue = 3,
+               .low = 1,
+               .high = 3,
+               .message = "tapping: invalid clsmask value %d",
+               .merge = Rule::bitOr},
+              {.name = "level",
+               .low = -5,
+               .high = 5,
+               .outOfRange = OutOfRange::kept,
+               .message = "tapping: invalid level value %d",
+               .merge = Rule::minimum}},
+     .properties = {{101, "classMask", "classMask"}, {102, "level", "level"}},
+     .judging = Judging::classSet},
+    {.sensor = "GSFLK",
+     .keys = {{.name = "classMask",
+               .defaultValue = 63,
+               .low = 1,
+               .high = 63,
+               .message = "gestureflick: invalid clsmask value %d",
+               .merge = Rule::bitOr},
+              {.name = "level",
+               .low = -5,
+               .high = 5,
+               .message = "gestureflick: invalid level value %d",
+               .merge = Rule::minimum}},
+     .properties = {{61, "classMask", "classMask"}, {62, "level", "level"}},
+     .judging = Judging::classNumber16,
+     .notJson = "gestureflick: invalid opton string %s, all set as default"},
+    {.sensor = "SHAKI",
+     .keys = {{.name = "sensitivity",
+               .defaultValue = 1,
+               .low = 0,
+               .high = 2,
+               .message = "shaking: invalid clsmask value %d",
+               .merge = Rule::maximum}},
+     .properties = {{81, "sensitivity", "sensitivity"}},
+     .notJson = "shaking: invalid opton string %s, all set as default"},
+    {.sensor = "ISACT",
+     .keys = {{.name = "classMask",
+               .defaultValue = 15,
+               .low = 1,
+               .high = 15,
+               .message = "instantactivity: invalid clsmask value %d",
+               .merge = Rule::bitOr}},
+     .properties = {{151, "classMask", "classMask"}},
+     .judging = Judging::classNumber32,
+     .tag = "STY",
+     .notJson = "instantactivity: invalid opton string %s, all set as default",
+     .acceptsNotJson = true},
+    {.sensor = "SCOUN",
+     .keys = {{.name = "mode", .defaultValue = 1, .low = 0, .high = 1, .merge = Rule::allOne},
+              {.name = "logN",
+               .defaultValue = 1,
+               .low = 1,
+               .high = 100,
+               .outOfRange = OutOfRange::clamped,
+               .merge = Rule::minimum}},
+     .properties = {{141, "mode", "mode"}, {142, "logN", "logN"}},
+     .judging = Judging::stepMultiples,
+     .acceptsNotJson = true},
+    {.sensor = "GSPX",
+     .keys = {{.name = "classMask",
+               .defaultValue = 65535,
+               .low = 1,
+               .high = 65535,
+               .message = "gesture hmm: invalid clsmask value %d",
+               .merge = Rule::bitOr}},
+     .judging = Judging::gestures,
+     .notJson = "gesture hmm: invalid opton string %s, all set as default"},
+    {.sensor = "DTWGS",
+     .keys = {{.name = "mode",
+               .low = 1,
+               .high = 4,
+               .outOfRange = OutOfRange::kept,
+               .message = "Invalid mode value %d",
+               .merge = Rule::bitOr},
+              {.name = "classMask",
+               .low = 1,
+               .high = 3,
+               .outOfRange = OutOfRange::kept,
+               .message = "Invalid mask value %d at match mode",
+               .merge = Rule::bitOr},
+              {.name = "level",
+               .low = -1,
+               .high = 1,
+               .outOfRange = OutOfRange::kept,
+               .message = "Invalid level value %d at match mode",
+               .merge = Rule::minimum},
+              {.name = "index",
+               .low = 0,
+               .high = 1,
+               .outOfRange = OutOfRange::kept,
+               .message = "Invalid index value %d at enroll mode"}},
+     .stringKeys = {"template1", "template2"},
+     .properties = {{121, "level"}, {122, "templateNumber"}, {123, "templateData"}},
+     .judging = Judging::classSet},
+    {.sensor = "GSETH",
+     .keys = {{.name = "classMask",
+               .defaultValue = 3,
+               .low = 1,
+               .high = 3,
+               .message = "gesture eartouch: invalid clsmask value %d",
+               .merge = Rule::bitOr}},
+     .properties = {{161, "classMask", "classMask"}},
+     .judging = Judging::classNumber16,
+     .notJson = "gesture eartouch: invalid opton string %s, all set as default"},
+    {.sensor = "LPE_P",
+     .keys = {{.name = "interval", .defaultValue = 5000, .merge = Rule::takeLast}},
+     .properties = {{0, "interval", "interval"}},
+     .notJson = "audio : invalid opton string %s, all set as default"},
+    {.sensor = "PDR",
+     .keys = {{.name = "userHeight",
+               .defaultValue = 1000,
+               .low = 100,
+               .high = 300,
+               .message = "PDR: invalid user height value %d"},
+              {.name = "floorHeight",
+               .defaultValue = 5000,
+               .low = 200,
+               .high = 800,
+               .message = "PDR: invalid floor height value %d"},
+              {.name = "initX", .defaultValue = 32767},
+              {.name = "initY", .defaultValue = 32767},
+              {.name = "initFloor", .defaultValue = 32767},
+              {.name = "N", .low = 0, .high = 6, .message = "PDR: invalid N value %d", .merge = Rule::minimum},
+              {.name = "6DOF", .defaultValue = 2, .low = 0, .high = 1, .message = "PDR: invalid 6DOF value %d"}},
+     .properties = {{181, "userHeight", "userHeight"},
+                    {182, "floorHeight", "floorHeight"},
+                    {183, "initX", "initX"},
+                    {184, "initY", "initY"},
+                    {185, "initFloor", "initFloor"},
+                    {186, "N", "N"},
+                    {187, "6DOF", "6DOF"}},
+     .judging = Judging::gathering},
+    // It takes no mask at all: each option string is logged as holding a bad one, and the mask stays 3.
+    {.sensor = "LIFT",
+     .keys = {{.name = "classMask",
+               .defaultValue = 3,
+               .low = 1,
+               .high = 0,
+               .message = "tapping: invalid clsmask value %d",
+               .merge = Rule::bitOr}},
+     .properties = {{201, "classMask", "classMask"}}},
+};
+static_assert(kKindTable[lift].sensor != nullptr, "a row for each kind");
+
+inline constexpr size_t kMostKeys = 7;
+
+constexpr const KindRow& rowOf(int kind) {
+  return kKindTable[static_cast<size_t>(kind)];
+}
+constexpr const Key& keyOf(int kind, size_t index) {
+  return rowOf(kind).keys.begin()[index];
+}
+
+// The sensor with that name; -1 when there is none.
+int kindNamed(std::string_view sensor);
+// The place of a key in its kind's row; the number of keys when there is no such key.
+size_t keyIndex(int kind, std::string_view key);
+
+}  // namespace senseloom::model
