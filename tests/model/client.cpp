@@ -27,6 +27,14 @@ constexpr uint8_t kBlock[48] = {128,  0,    0,    0,    12,   0,    20,   0,    
 
 void* const kUntouchedPointer = const_cast<int*>(&kUntouched);
 
+// The name that a call opens or finds a sensor by.
+std::string sensorNameOf(const Call& call) {
+  const std::string name = call.otherName.value_or(kSensorNames[call.sensor]);
+  return call.misuse == Call::longName ? name + "ABCDE" : name;
+}
+
+}  // namespace
+
 void setAnswers(const Answers& answers) {
   auto& platform = fake::platform();
   platform.getResult = answers.get;
@@ -39,10 +47,33 @@ void setAnswers(const Answers& answers) {
   platform.gestureNames.assign(answers.names.begin(), answers.names.end());
 }
 
-// The name that a call opens or finds a sensor by.
-std::string sensorNameOf(const Call& call) {
-  const std::string name = call.otherName.value_or(kSensorNames[call.sensor]);
-  return call.misuse == Call::longName ? name + "ABCDE" : name;
+model::Log logged() {
+  model::Log log;
+  for (const auto& [priority, tag, text] : fake::platform().takeLog()) log.push_back({priority, tag, text});
+  return log;
+}
+
+namespace {
+
+// What the platform was called for and what it logged since the last call.
+void observePlatform(Observation& observation) {
+  auto& platform = fake::platform();
+  Outcome& outcome = observation.outcome;
+  outcome.log = logged();
+  outcome.calls = std::exchange(platform.calls, {});
+  for (const auto& [samples, count, last] : std::exchange(platform.groups, {})) {
+    outcome.groups.push_back({samples, count, last});
+  }
+  outcome.engineStarts = static_cast<int>(platform.gestureInitials.size());
+  outcome.engineCloses = std::exchange(platform.gestureCloses, 0);
+  for (const auto& arguments : std::exchange(platform.gestureInitials, {})) {
+    if (arguments != std::array<int, 2>{}) observation.complaint += "the engine was started with other than zeros; ";
+  }
+  if (std::count(outcome.calls.begin(), outcome.calls.end(), "activate") > 0) {
+    auto block = platform.activationBlock;
+    block[10] = block[11] = 0;  // padding
+    if (!std::equal(block.begin(), block.end(), kBlock)) observation.complaint += "a wrong activation block; ";
+  }
 }
 
 }  // namespace
@@ -192,26 +223,6 @@ Observation Client::dispatch(const Call& call, void* handle) {
   return observation;
 }
 
-void Client::observePlatform(Observation& observation) {
-  auto& platform = fake::platform();
-  Outcome& outcome = observation.outcome;
-  for (const auto& [priority, tag, text] : platform.takeLog()) outcome.log.push_back({priority, tag, text});
-  outcome.calls = std::exchange(platform.calls, {});
-  for (const auto& [samples, count, last] : std::exchange(platform.groups, {})) {
-    outcome.groups.push_back({samples, count, last});
-  }
-  outcome.engineStarts = static_cast<int>(platform.gestureInitials.size());
-  outcome.engineCloses = std::exchange(platform.gestureCloses, 0);
-  for (const auto& arguments : std::exchange(platform.gestureInitials, {})) {
-    if (arguments != std::array<int, 2>{}) observation.complaint += "the engine was started with other than zeros; ";
-  }
-  if (std::count(outcome.calls.begin(), outcome.calls.end(), "activate") > 0) {
-    auto block = platform.activationBlock;
-    block[10] = block[11] = 0;  // padding
-    if (!std::equal(block.begin(), block.end(), kBlock)) observation.complaint += "a wrong activation block; ";
-  }
-}
-
 void Client::noteOpened(const Call& call, void* handle) {
   std::erase(opened, call.session);
   sessions[call.session] = {handle, call.sensor, true};
@@ -243,14 +254,20 @@ void Client::restore() {
   sessions.clear();
   opened.clear();
   buffers.clear();
+  restoreLibrary(std::exchange(gaveTemplates, false), std::exchange(openedGestures, false));
+}
+
+void restoreLibrary(bool gaveTemplates, bool openedGestures) {
+  setAnswers({});
+  ctx_option_t* list = nullptr;
   ctx_uninit();
-  if (std::exchange(gaveTemplates, false)) {
+  if (gaveTemplates) {
     const std::string empty = "\"0000" + std::string(1800, '0') + '"';
     void* handle = ctx_open_session("DTWGS");
     ctx_set_option(handle, 0, (R"({"template1":)" + empty + R"(,"template2":)" + empty + '}').c_str(), &list);
     ctx_close_session(handle, &list);
   }
-  if (std::exchange(openedGestures, false)) {
+  if (openedGestures) {
     uint8_t record[24] = {1};
     void* result = nullptr;
     int length = 0;

@@ -27,6 +27,14 @@ struct Observation {
   std::string complaint;         // empty: none
 };
 
+// Has the platform answer so from now on.
+void setAnswers(const model::Answers& answers);
+// The lines logged since the last call.
+model::Log logged();
+// Makes the library, in which no session is open, as it was when it was loaded; only getSensor() tells afterwards that
+// there were any calls. Takes to be told whether templates were stored and whether gestures may have been recognised.
+void restoreLibrary(bool gaveTemplates, bool openedGestures);
+
 // Makes calls on the library, on fakes of the platform, and remembers the sessions by their names in the calls.
 class Client {
  public:
@@ -57,7 +65,6 @@ class Client {
 
   void noteOpened(const Call& call, void* handle);
   Observation dispatch(const Call& call, void* handle);
-  void observePlatform(Observation& observation);
 
   std::map<int, Session> sessions;
   std::vector<int> opened;

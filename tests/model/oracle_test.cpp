@@ -10,6 +10,7 @@
 #include <utility>
 
 #include "comparison.h"
+#include "explained.h"
 #include "generator.h"
 #include "shrinker.h"
 
@@ -75,6 +76,24 @@ TEST(Oracle, LibraryDoesWhatTheModelDoesInRandomSequencesOfCalls) {
     EXPECT_EQ(tally.nothings > SEQUENCES / 100, !deliversAll);
     EXPECT_EQ(tally.refusedRecords > SEQUENCES / 500, sensor == phyac || sensor == gspx || sensor == pdr);
   }
+}
+
+// The tool explains what the library does by the same model, which there sees no more than a trace and the log tell.
+TEST(Oracle, ExplainLeavesNothingUnexplainedInRandomSequencesOfCalls) {
+  const auto isUnexplained = [](const Sequence& sequence) {
+    return explained(sequence).find("unexplained") != std::string::npos;
+  };
+  const uint64_t seed = uint64_t{randomSeed()} << 32;
+  size_t printed = 0;
+  for (uint64_t i = 0; i < SEQUENCES; ++i) {
+    const std::string text = explained(sequenceOf(seed + i));
+    printed += text.size();
+    if (text.find("unexplained") == std::string::npos) continue;
+    const Sequence least = shrink(sequenceOf(seed + i), isUnexplained);
+    FAIL() << "sequence " << i << " of " << SEQUENCES << "; the least of it that fails:\n"
+           << toTrace(least) << explained(least);
+  }
+  EXPECT_GT(printed, SEQUENCES * size_t{500});  // nothing is unexplained of what is not explained at all
 }
 
 int countOf(const Sequence& sequence, Call::What what) {

@@ -39,6 +39,7 @@ class Explaining {
                          .sensor = layout,
                          .failed = returned < 0,
                          .returned = returned,
+                         .result = result,
                          .record = record});
   }
   void end() { explainer.onEnd(); }
@@ -152,6 +153,31 @@ TEST(Explainer, SaysWhichRecordIsUnexplainedAndCountsIt) {
             "what became of the records\n"
             "  session  sensor  records  delivered  unexplained\n"
             "  a        STAP          3          1            2\n");
+}
+
+TEST(Explainer, SaysWhenOtherBytesAreDelivered) {
+  EXPECT_EQ(explained("STAP",
+                      [](Explaining& a) {
+                        a.dispatch(kSingleTap, 1, {1, 0, 0, 0, 0, 0, 0, 0, 1, 0});
+                        a.dispatch(kSingleTap, 1, {0, 0, 0, 0, 0, 0, 0, 0, 1});
+                        a.end();
+                      }),
+            "line 7: a on STAP unexplained: the library delivered other bytes than were derived\n"
+            "line 7: a on STAP unexplained: the library delivered other bytes than were derived\n"
+            "\n"
+            "what became of the records\n"
+            "  session  sensor  records  delivered  unexplained\n"
+            "  a        STAP          2          0            2\n");
+}
+
+TEST(Explainer, TakesALineThatThePlatformCutAsLogged) {
+  const std::string text(2000, 'x');
+  const std::string line = "gestureflick: invalid opton string " + text;
+  const std::string explanation = explained("GSFLK", [&](Explaining& a) {
+    __android_log_print(ANDROID_LOG_ERROR, "libsenseloom", "%s", line.substr(0, 1023).c_str());
+    a.set(text, -1, std::nullopt);
+  });
+  EXPECT_EQ(explanation.find("unexplained"), std::string::npos) << explanation;
 }
 
 TEST(LogCapture, GivesBackTheLogWhenItIsGone) {
