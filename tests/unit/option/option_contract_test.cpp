@@ -1,319 +1,263 @@
-// What all option kinds have in common, checked on every kind.
+// What all kinds of option have in common, checked on every kind against the model of the library.
 
 #include <gtest/gtest.h>
 
-#include <algorithm>
+#include <array>
 #include <cstdint>
-#include <iterator>
 #include <limits>
 #include <memory>
 #include <optional>
 #include <ostream>
+#include <set>
 #include <string>
-#include <utility>
 #include <vector>
 
 #include "allocations.h"
-#include "option/option_kinds.h"
-#include "option_contract_kinds.h"
+#include "model/kinds.h"
+#include "model/merging.h"
+#include "model/option_reading.h"
+#include "option/all_options.h"
 #include "option_test_support.h"
 
 namespace senseloom {
 namespace {
 
-constexpr int32_t kMin = std::numeric_limits<int32_t>::min();
-constexpr int32_t kMax = std::numeric_limits<int32_t>::max();
+static_assert(std::size(kOptionDescriptions) == model::kKinds, "the model knows every kind");
 
-std::string withValue(std::string message, const std::string& value) {
-  return message.replace(message.find('%'), 1, value);
+template <class Kind>
+std::unique_ptr<Option> make() {
+  return std::make_unique<Kind>();
 }
-
-// What a string did to an option.
-struct Outcome {
-  int result;
-  Values settings;
-  std::vector<fake::LogLine> log;
-  bool operator==(const Outcome&) const = default;
+constexpr std::unique_ptr<Option> (*kMake[])() = {
+#define SENSOR_KIND(SensorClass, SessionClass, OptionClass, BaseClass) make<OptionClass>,
+#include "sensor_kinds.def"
+#undef SENSOR_KIND
 };
-void PrintTo(const Outcome& outcome, std::ostream* out) {
-  *out << "result " << outcome.result << ", settings " << testing::PrintToString(outcome.settings) << ", log "
-       << testing::PrintToString(outcome.log);
+
+// What a string did to an option, and the list that it renders now; no list: null.
+struct Seen {
+  int result;
+  std::vector<fake::LogLine> log;
+  std::optional<model::PropertyList> list;
+  bool operator==(const Seen&) const = default;
+};
+void PrintTo(const Seen& seen, std::ostream* out) {
+  *out << "result " << seen.result << ", log " << testing::PrintToString(seen.log) << ", list";
+  if (!seen.list) *out << " null";
+  if (!seen.list) return;
+  for (const auto& entry : *seen.list) *out << ' ' << entry.id << '=' << testing::PrintToString(entry.value);
 }
 
-class OptionContract : public testing::TestWithParam<Kind> {
- protected:
-  const Kind& kind = GetParam();
+std::optional<model::PropertyList> contentOf(const PropertyList& list) {
+  if (list == nullptr) return std::nullopt;
+  model::PropertyList entries;
+  for (int i = 0; i < list->count; ++i) {
+    const ctx_property_t& entry = list->properties[i];
+    entries.push_back({entry.id, {static_cast<const char*>(entry.value), static_cast<size_t>(entry.size)}});
+  }
+  return entries;
+}
 
-  // A string with a JSON text a key, some of them none.
-  std::string object(const std::vector<std::optional<std::string>>& texts) const {
+// An option of the library, and what the model has in its place.
+class Both {
+ public:
+  explicit Both(int kind) : option(kMake[kind]()), request(kind) {}
+
+  Seen parse(const std::string& text) {
+    fake::platform().takeLog();
+    const int result = option->parse(text.c_str());
+    auto list = contentOf(listOf(*option));
+    return {result, fake::platform().takeLog(), std::move(list)};
+  }
+  Seen expected(const std::string& text) {
+    model::Log log;
+    const bool isTaken = model::readOption(request, text.c_str(), true, {templates, log, nullptr});
+    auto list = rendered(model::Merged(request), log);
+    std::vector<fake::LogLine> lines;
+    for (const auto& [priority, tag, line] : log) lines.push_back({priority, tag, line});
+    return {isTaken ? 0 : -1, lines, std::move(list)};
+  }
+  std::optional<model::PropertyList> rendered(const model::Merged& merged, model::Log& log) const {
+    std::optional<model::Remark> conflict;
+    auto list = merged.render(templates, log, conflict);
+    if (!list) return std::nullopt;
+    for (auto& entry : *list) entry.slot = -1;
+    return list;
+  }
+
+  std::unique_ptr<Option> option;
+  model::Request request;
+  model::Templates templates;
+};
+
+class OptionContract : public testing::TestWithParam<int> {
+ protected:
+  const int kind = GetParam();
+  const model::KindRow& row = model::rowOf(kind);
+  const OptionDescription& description = *kOptionDescriptions[static_cast<size_t>(kind)];
+
+  // A string in which every key has a value in its range, but for one that has another text, or none.
+  std::string object(const std::string& other = "", const std::optional<std::string>& text = std::nullopt) const {
     std::string members;
-    for (size_t i = 0; i < texts.size(); ++i) {
-      if (texts[i]) members += (members.empty() ? "\"" : ",\"") + kind.keys[i].name + "\":" + *texts[i];
+    for (const model::Key& key : row.keys) {
+      const bool isOther = key.name == other;
+      if (isOther && !text) continue;
+      members += (members.empty() ? "\"" : ",\"") + std::string(key.name) + "\":";
+      members += isOther ? *text : std::to_string(goodValue(key));
     }
     return "{" + members + "}";
   }
-  std::string object(const Values& values) const {
-    std::vector<std::optional<std::string>> texts;
-    for (const int32_t value : values) texts.emplace_back(std::to_string(value));
-    return object(texts);
-  }
-  // The common string with another text for one key, or none.
-  std::string commonBut(size_t key, const std::optional<std::string>& text) const {
-    std::vector<std::optional<std::string>> texts;
-    for (const int32_t value : kind.common) texts.emplace_back(std::to_string(value));
-    texts[key] = text;
-    return object(texts);
+  std::string good() const { return object(); }
+
+  static int32_t goodValue(const model::Key& key) {
+    if (key.low > key.high) return key.defaultValue;
+    return key.high == std::numeric_limits<int32_t>::max() ? 7 : key.high;
   }
 
-  Values defaults() const {
-    Values values;
-    for (const Key& key : kind.keys) values.push_back(key.defaultValue);
-    return values;
-  }
-  Values commonBut(size_t key, int32_t setting) const {
-    Values values = kind.common;
-    values[key] = setting;
-    return values;
-  }
-
-  size_t indexOf(const std::string& key) const {
-    return static_cast<size_t>(std::ranges::find(kind.keys, key, &Key::name) - kind.keys.begin());
-  }
-
-  std::vector<fake::LogLine> lines(const std::vector<std::string>& texts) const {
-    std::vector<fake::LogLine> lines;
-    for (const auto& text : texts) lines.push_back({kError, kind.tag, text});
-    return lines;
-  }
-  std::vector<fake::LogLine> rejection(size_t key, int32_t value) const {
-    const std::string& message = kind.keys[key].message;
-    return message.empty() ? std::vector<fake::LogLine>{} : lines({withValue(message, std::to_string(value))});
-  }
-  std::vector<fake::LogLine> unparsable(const std::string& text) const {
-    return kind.unparsable.empty() ? std::vector<fake::LogLine>{} : lines({withValue(kind.unparsable, text)});
-  }
-  std::vector<Property> commonProperties() const {
-    std::vector<Property> properties;
-    for (const auto& [id, value] : kind.properties) properties.push_back({id, 4, value});
-    return properties;
-  }
-
-  Outcome parse(Option& option, const char* text) const {
+  std::unique_ptr<Option> goodOption() const {
+    auto option = kMake[kind]();
+    EXPECT_EQ(option->parse(good().c_str()), 0);
     fake::platform().takeLog();
-    const int result = option.parse(text);
-    return {result, kind.settings(option), fake::platform().takeLog()};
-  }
-  Outcome parse(Option& option, const std::string& text) const { return parse(option, text.c_str()); }
-  // ... to a new option.
-  Outcome parse(const std::string& text) const { return parse(*kind.make(), text); }
-
-  std::unique_ptr<Option> parsed(const Values& values) const {
-    auto option = kind.make();
-    EXPECT_EQ(option->parse(object(values).c_str()), 0) << object(values);
     return option;
   }
-  std::unique_ptr<Option> common() const { return parsed(kind.common); }
 
-  // Runs `check(index)` for each key of the kind.
-  template <class Check>
-  void forEachKey(Check check) const {
-    for (size_t key = 0; key < kind.keys.size(); ++key) {
-      SCOPED_TRACE(kind.keys[key].name);
-      check(key);
-    }
+  // Gives the string to a new option and to one that holds values.
+  void check(const std::string& text) const {
+    SCOPED_TRACE(text);
+    Both fresh(kind);
+    EXPECT_EQ(fresh.parse(text), fresh.expected(text));
+    Both used(kind);
+    EXPECT_EQ(used.parse(good()), used.expected(good()));
+    EXPECT_EQ(used.parse(text), used.expected(text));
   }
 
-  // The library's own description of the kind.
-  const OptionDescription& description() const {
-    return **std::ranges::find(kOptionKinds, std::string(kind.sensor),
-                               [](const OptionDescription* each) { return std::string(each->sensor); });
+  // Values at the bounds of the keys and around them, and those that have to be cut to 32 bits.
+  std::set<int64_t> values() const {
+    std::set<int64_t> all = {-2147483649, -4294967295, 2147483648, 4294967295, 4294967296, 4294967298};
+    all.insert(std::numeric_limits<int64_t>::min());
+    all.insert(std::numeric_limits<int64_t>::max());
+    for (int64_t value = -9; value <= 9; ++value) all.insert(value);
+    for (const model::Key& key : row.keys) {
+      for (const int64_t bound : {key.low, key.high}) all.insert({bound - 1, bound, bound + 1});
+    }
+    return all;
   }
 };
 
-INSTANTIATE_TEST_SUITE_P(Sensor, OptionContract, testing::ValuesIn(expectedKinds()),
-                         [](const auto& instance) { return std::string(instance.param.sensor); });
-
-TEST(OptionKinds, AreTheTwelveInTheOrderOfTheRegistry) {
-  std::vector<std::string> described;
-  for (const OptionDescription* description : kOptionKinds) described.emplace_back(description->sensor);
-  EXPECT_EQ(described, (std::vector<std::string>{"PHYAC", "STAP", "GSFLK", "SHAKI", "ISACT", "SCOUN", "GSPX", "DTWGS",
-                                                 "GSETH", "LPE_P", "PDR", "LIFT"}));
-  std::vector<std::string> tested;
-  for (const Kind& kind : expectedKinds()) tested.emplace_back(kind.sensor);
-  EXPECT_EQ(tested, described);
+std::vector<int> allKinds() {
+  std::vector<int> kinds;
+  for (int kind = 0; kind < model::kKinds; ++kind) kinds.push_back(kind);
+  return kinds;
 }
+INSTANTIATE_TEST_SUITE_P(Sensor, OptionContract, testing::ValuesIn(allKinds()),
+                         [](const auto& instance) { return std::string(model::rowOf(instance.param).sensor); });
 
 TEST_P(OptionContract, DescriptionTellsTheKeys) {
-  ASSERT_EQ(description().keys.size(), kind.keys.size());
-  forEachKey([&](size_t i) {
-    const OptionKey& described = description().keys[i];
-    const Key& key = kind.keys[i];
-    EXPECT_EQ(described.name, key.name);
+  EXPECT_STREQ(description.sensor, row.sensor);
+  ASSERT_EQ(description.keys.size(), row.keys.size());
+  for (size_t i = 0; i < row.keys.size(); ++i) {
+    const OptionKey& described = description.keys[i];
+    const model::Key& key = row.keys.begin()[i];
+    SCOPED_TRACE(key.name);
+    EXPECT_STREQ(described.name, key.name);
     EXPECT_EQ(described.defaultValue, key.defaultValue);
-    EXPECT_EQ(described.range.low, key.range.low);
-    EXPECT_EQ(described.range.high, key.range.high);
-    EXPECT_EQ(described.outOfRange, key.outOfRange);
+    EXPECT_EQ(described.range.low, key.low);
+    EXPECT_EQ(described.range.high, key.high);
     EXPECT_EQ(described.fallback, key.fallback);
-    EXPECT_EQ(described.message != nullptr ? described.message : "",
-              key.message.empty() ? "" : withValue(key.message, "%d"));
-    EXPECT_EQ(described.merge, key.merge);
-  });
-  const auto& stringKeys = description().stringKeys;
-  EXPECT_EQ(std::vector<std::string>(stringKeys.begin(), stringKeys.end()), kind.stringKeys);
+    EXPECT_STREQ(described.message, key.message);
+    // Both name the same in the same order.
+    EXPECT_EQ(static_cast<int>(described.outOfRange), static_cast<int>(key.outOfRange));
+    EXPECT_EQ(static_cast<int>(described.merge), static_cast<int>(key.merge));
+  }
+  EXPECT_EQ(std::vector<std::string>(description.stringKeys.begin(), description.stringKeys.end()),
+            std::vector<std::string>(row.stringKeys.begin(), row.stringKeys.end()));
 }
 
 TEST_P(OptionContract, DescriptionTellsThePropertiesAndTheLog) {
-  std::vector<int32_t> ids;
-  std::vector<int> keys;
-  for (const OptionProperty& property : description().properties) {
-    ids.push_back(property.id);
-    keys.push_back(property.key);
+  ASSERT_EQ(description.properties.size(), row.properties.size());
+  for (size_t i = 0; i < row.properties.size(); ++i) {
+    EXPECT_EQ(description.properties[i].id, row.properties.begin()[i].id);
+    EXPECT_STREQ(description.properties[i].name, row.properties.begin()[i].name);
   }
-  EXPECT_EQ(ids, kind.describedIds);
-  EXPECT_EQ(keys, kind.describedKeys);
-  EXPECT_EQ(description().logTag, kind.tag);
-  EXPECT_EQ(description().unparsableMessage != nullptr ? description().unparsableMessage : "",
-            kind.unparsable.empty() ? "" : withValue(kind.unparsable, "%s"));
-  EXPECT_EQ(description().unparsableResult, kind.unparsableResult);
-  EXPECT_EQ(description().nullIsUnparsable, kind.nullIsLogged);
+  EXPECT_STREQ(description.logTag, row.tag);
+  EXPECT_STREQ(description.unparsableMessage, row.notJson);
+  // The step counter's option refuses what its session accepts.
+  EXPECT_EQ(description.unparsableResult, row.acceptsNotJson && kind != model::scoun ? 0 : -1);
+  EXPECT_EQ(description.nullIsUnparsable, kind == model::isact);
 }
 
-TEST_P(OptionContract, NewOptionEmptyObjectAndTopLevelArrayHaveTheDefaults) {
-  EXPECT_EQ(kind.settings(*kind.make()), defaults());
-  const int result = kind.takesEmptyObject ? 0 : -1;
-  for (const char* text : {"{}", " { } ", "[]", "[1, {\"classMask\": 1}]"}) {
-    SCOPED_TRACE(text);
-    EXPECT_EQ(parse(text), (Outcome{result, defaults(), lines(kind.loggedOfEmptyObject)}));
-    EXPECT_EQ(parse(*common(), text),
-              (Outcome{result, kind.takesEmptyObject ? defaults() : kind.common, lines(kind.loggedOfEmptyObject)}));
-  }
-}
-
-TEST_P(OptionContract, TakesValuesUpToTheBoundsSilently) {
-  EXPECT_EQ(parse(object(kind.common)), (Outcome{0, kind.common, lines(kind.loggedOfCommon)}));
-  for (const auto& [name, values] : kind.taken) {
-    const size_t key = indexOf(name);
-    for (const int32_t value : values) {
-      const std::string text = commonBut(key, std::to_string(value));
-      EXPECT_EQ(parse(text), (Outcome{0, commonBut(key, value), {}})) << text;
-    }
-  }
-}
-
-TEST_P(OptionContract, LogsAndReplacesAValueOutOfRangeOrRefusesTheString) {
-  const auto check = [&](size_t key, int32_t value, const Outcome& ofNew, const Outcome& ofCommon) {
-    const std::string text = commonBut(key, std::to_string(value));
-    EXPECT_EQ(parse(text), ofNew) << text;
-    EXPECT_EQ(parse(*common(), text), ofCommon) << text << " given to an option that holds values";
-  };
-  const auto checkTaken = [&](size_t key, int32_t value, const Values& settings) {
-    const Outcome outcome{0, settings, rejection(key, value)};
-    check(key, value, outcome, outcome);
-  };
-  for (const auto& [name, stored, values] : kind.replaced) {
-    const size_t key = indexOf(name);
-    for (const int32_t value : values) checkTaken(key, value, commonBut(key, stored));
-  }
-  for (const auto& [name, value, settings] : kind.particular) checkTaken(indexOf(name), value, settings);
-  for (const auto& [name, values] : kind.refused) {
-    const size_t key = indexOf(name);
-    for (const int32_t value : values) {
-      check(key, value, {-1, defaults(), rejection(key, value)}, {-1, kind.common, rejection(key, value)});
-    }
-  }
-}
-
-TEST_P(OptionContract, MissingKeyHasItsDefault) {
-  forEachKey([&](size_t i) {
-    EXPECT_EQ(parse(commonBut(i, std::nullopt)), parse(commonBut(i, std::to_string(kind.keys[i].defaultValue))));
-  });
-}
-
-TEST_P(OptionContract, ValueOfAnotherTypeCountsAsMissing) {
-  forEachKey([&](size_t i) {
-    const Outcome missing = parse(commonBut(i, std::nullopt));
+TEST_P(OptionContract, TakesReplacesOrRefusesEachValueOfEachKey) {
+  check(good());
+  for (const model::Key& key : row.keys) {
+    check(object(key.name));
+    for (const int64_t value : values()) check(object(key.name, std::to_string(value)));
     for (const char* text :
          {R"("3")", R"("")", "2.0", "1e0", "-0.0", "true", "false", "null", "{}", R"({"value":1})", "[]", "[1]"}) {
-      EXPECT_EQ(parse(commonBut(i, text)), missing) << text;
+      check(object(key.name, text));
     }
-  });
-}
-
-TEST_P(OptionContract, UnknownKeysAreIgnored) {
-  const std::string known = object(kind.common);
-  for (const char* unknown : {R"("unknown":1)", R"("":0)", R"("ClassMask":0,"LEVEL":9,"Mode":3)", R"("classMask ":0)",
-                              R"("unknown":{"mode":7,"classMask":0,"level":9})", R"("unknown":[null,"text",1.5])"}) {
-    const std::string text = known.substr(0, known.size() - 1) + "," + unknown + "}";
-    EXPECT_EQ(parse(text), (Outcome{0, kind.common, lines(kind.loggedOfCommon)})) << text;
+    const std::string again = ",\"" + std::string(key.name) + "\":";
+    check(object(key.name, "2" + again + "1"));
+    check(object(key.name, "1" + again + "\"2\""));
   }
 }
 
-TEST_P(OptionContract, IntegersAreCutTo32Bits) {
-  const std::pair<const char*, int32_t> cases[] = {
-      {"2147483648", kMin}, {"-2147483649", kMax},       {"4294967295", -1},
-      {"4294967296", 0},    {"4294967297", 1},           {"-4294967295", 1},
-      {"4294967298", 2},    {"9223372036854775807", -1}, {"-9223372036854775808", 0},
-  };
-  forEachKey([&](size_t i) {
-    for (const auto& [text, cut] : cases) {
-      EXPECT_EQ(parse(commonBut(i, text)), parse(commonBut(i, std::to_string(cut)))) << text;
-    }
-  });
+TEST_P(OptionContract, ReadsAnyStringAsTheModelDoes) {
+  const std::string known = good().substr(0, good().size() - 1);
+  for (const char* unknown : {R"("unknown":1)", R"("":0)", R"("ClassMask":0,"LEVEL":9,"Mode":3)", R"("classMask ":0)",
+                              R"("unknown":{"mode":7,"classMask":0,"level":9})", R"("unknown":[null,"text",1.5])"}) {
+    check(known + "," + unknown + "}");
+  }
+  for (const char* text : {"{}", " { } ", "[]", "[1, {\"classMask\": 1}]"}) check(text);
 }
 
-TEST_P(OptionContract, LastOfTwoValuesOfAKeyCounts) {
-  forEachKey([&](size_t i) {
-    const std::string again = ",\"" + kind.keys[i].name + "\":";
-    EXPECT_EQ(parse(commonBut(i, "2" + again + "1")), parse(commonBut(i, "1")));
-    EXPECT_EQ(parse(commonBut(i, "1" + again + "\"2\"")), parse(commonBut(i, std::nullopt)));
-  });
-}
-
-TEST_P(OptionContract, TextThatIsNoJsonChangesNothing) {
+TEST_P(OptionContract, TextThatIsNotJsonChangesNothing) {
   std::vector<std::string> texts = {
       "", " ", "no JSON", "{", "{} {}", "3", "\"text\"", "null", "{'classMask':1}", "{\"classMask\":1,}"};
   texts.push_back(std::string(3000, '[') + std::string(3000, ']'));  // nests deeper than the parser follows
-  forEachKey([&](size_t i) {
-    texts.push_back(commonBut(i, "9223372036854775808"));  // of more than 64 bits
-    texts.push_back(commonBut(i, "-9223372036854775809"));
-    texts.push_back(commonBut(i, "01"));
-  });
+  for (const model::Key& key : row.keys) {
+    for (const char* number : {"9223372036854775808", "-9223372036854775809", "01", "1e999"}) {
+      texts.push_back(object(key.name, number));
+    }
+  }
   for (const std::string& text : texts) {
     SCOPED_TRACE(text);
-    const auto option = common();
-    const PropertyList list = listOf(*option);
-    EXPECT_EQ(parse(text), (Outcome{kind.unparsableResult, defaults(), unparsable(text)}));
-    EXPECT_EQ(parse(*option, text), (Outcome{kind.unparsableResult, kind.common, unparsable(text)}));
-    EXPECT_EQ(entriesOf(list), commonProperties());
-    EXPECT_EQ(entriesOf(listOf(*option)), commonProperties());
+    Both both(kind);
+    EXPECT_EQ(both.parse(good()), both.expected(good()));
+    const PropertyList list = listOf(*both.option);
+    const auto before = entriesOf(list);
+    Seen expected = both.expected(text);
+    expected.result = description.unparsableResult;
+    EXPECT_EQ(both.parse(text), expected);
+    EXPECT_EQ(entriesOf(list), before);
   }
 }
 
 TEST_P(OptionContract, NullTextChangesNothing) {
-  const auto logged = kind.nullIsLogged ? unparsable("(null)") : std::vector<fake::LogLine>{};
-  const char* none = nullptr;
-  const auto option = common();
+  const auto option = goodOption();
   const PropertyList list = listOf(*option);
-  EXPECT_EQ(parse(*kind.make(), none), (Outcome{kind.unparsableResult, defaults(), logged}));
-  EXPECT_EQ(parse(*option, none), (Outcome{kind.unparsableResult, kind.common, logged}));
-  EXPECT_EQ(entriesOf(list), commonProperties());
-  EXPECT_EQ(entriesOf(listOf(*option)), commonProperties());
+  const auto before = entriesOf(list);
+  EXPECT_EQ(option->parse(nullptr), description.unparsableResult);
+  std::vector<fake::LogLine> logged;
+  if (kind == model::isact) {
+    logged = {{kError, "STY", "instantactivity: invalid opton string (null), all set as default"}};
+  }
+  EXPECT_EQ(fake::platform().takeLog(), logged);
+  EXPECT_EQ(entriesOf(list), before);
+  EXPECT_EQ(entriesOf(listOf(*option)), before);
 }
 
-TEST_P(OptionContract, RendersItsPropertiesInOrder) {
-  const auto option = common();
-  fake::platform().takeLog();
+TEST_P(OptionContract, RendersTheSameAgainAndNothingWithoutAPlaceForIt) {
+  const auto option = goodOption();
   const PropertyList list = listOf(*option);
-  EXPECT_EQ(entriesOf(list), commonProperties());
-  EXPECT_EQ(entriesOf(listOf(*option)), commonProperties()) << "a second time";
+  const auto entries = entriesOf(list);
+  EXPECT_EQ(entriesOf(listOf(*option)), entries);
   option->setProperty(nullptr);
-  EXPECT_EQ(entriesOf(list), commonProperties()) << "after there was no place for a list";
-  EXPECT_EQ(kind.settings(*option), kind.common);
+  EXPECT_EQ(entriesOf(list), entries);
   EXPECT_TRUE(fake::platform().log.empty());
 }
 
 TEST_P(OptionContract, RendersNullWhenMemoryRanOut) {
-  const auto option = common();
+  const auto option = goodOption();
   const PropertyList other(Option::newOption(0));
   ctx_option_t* list = other.get();
   {
@@ -321,64 +265,69 @@ TEST_P(OptionContract, RendersNullWhenMemoryRanOut) {
     option->setProperty(&list);
   }
   EXPECT_EQ(list, nullptr);
-  EXPECT_EQ(entriesOf(listOf(*option)), commonProperties());
+  EXPECT_NE(listOf(*option), nullptr);
 }
 
 TEST_P(OptionContract, ValuesOfAListAreZeroAfterTheNextString) {
-  const auto option = common();
+  const auto option = goodOption();
   const PropertyList list = listOf(*option);
-  ASSERT_EQ(option->parse(object(kind.common).c_str()), 0);
-  std::vector<Property> zeroed;
-  for (const auto& [id, value] : kind.properties) zeroed.push_back({id, 4, 0});
-  EXPECT_EQ(entriesOf(list), zeroed);
+  ASSERT_EQ(option->parse(good().c_str()), 0);
+  for (const Property& entry : entriesOf(list)) EXPECT_EQ(entry.value, 0) << entry.id;
 }
 
-TEST_P(OptionContract, MergesByTheRulesOfItsKeys) {
-  for (const Merging& merging : kind.mergings) {
-    const auto option = parsed(merging.mine);
-    const auto other = parsed(merging.other);
-    const Values otherSettings = kind.settings(*other);
-    fake::platform().takeLog();
-    option->merge(*other);
-    EXPECT_EQ(kind.settings(*option), merging.merged) << object(merging.mine) << " with " << object(merging.other);
-    EXPECT_EQ(kind.settings(*other), otherSettings);
-    EXPECT_TRUE(fake::platform().log.empty());
+TEST_P(OptionContract, MergesAsTheModelDoes) {
+  std::vector<std::string> texts = {good()};
+  for (const model::Key& key : row.keys) {
+    for (const int64_t value : {int64_t{key.low}, int64_t{key.low} + 1, int64_t{key.defaultValue}, int64_t{1}}) {
+      texts.push_back(object(key.name, std::to_string(value)));
+    }
+  }
+  for (const std::string& mine : texts) {
+    for (const std::string& theirs : texts) {
+      SCOPED_TRACE(mine + " with " + theirs);
+      Both one(kind);
+      Both other(kind);
+      EXPECT_EQ(one.parse(mine), one.expected(mine));
+      EXPECT_EQ(other.parse(theirs), other.expected(theirs));
+      const PropertyList list = listOf(*other.option);
+      const auto before = contentOf(list);
+      model::Merged merged(one.request);
+      merged.merge(other.request);
+      fake::platform().takeLog();
+      one.option->merge(*other.option);
+      EXPECT_TRUE(fake::platform().takeLog().empty());
+      model::Log log;
+      EXPECT_EQ(contentOf(listOf(*one.option)), one.rendered(merged, log));
+      EXPECT_EQ(contentOf(list), before);
+    }
   }
 }
 
 TEST_P(OptionContract, MergingLeavesTheValuesOfAListAlone) {
-  for (const Merging& merging : kind.mergings) {
-    const auto option = common();
-    const auto other = parsed(merging.mine);
-    const PropertyList list = listOf(*option);
-    const PropertyList otherList = listOf(*other);
-    const auto otherEntries = entriesOf(otherList);
-    option->merge(*other);
-    EXPECT_EQ(entriesOf(list), commonProperties());
-    EXPECT_EQ(entriesOf(otherList), otherEntries);
-  }
+  const auto option = goodOption();
+  const PropertyList list = listOf(*option);
+  const auto entries = entriesOf(list);
+  option->merge(*goodOption());
+  option->merge(*kMake[kind]());
+  EXPECT_EQ(entriesOf(list), entries);
 }
 
 TEST_P(OptionContract, CloneHasTheSettingsAndListsOfItsOwn) {
-  auto option = common();
+  auto option = goodOption();
   const PropertyList list = listOf(*option);
-  fake::platform().takeLog();
+  const auto entries = entriesOf(list);
   const auto copy = option->clone();
-  EXPECT_TRUE(fake::platform().log.empty());
-  EXPECT_EQ(kind.settings(*copy), kind.cloned.empty() ? kind.common : kind.cloned);
-
+  EXPECT_TRUE(fake::platform().takeLog().empty());
   const PropertyList listOfCopy = listOf(*copy);
-  EXPECT_EQ(entriesOf(listOfCopy), commonProperties());
+  EXPECT_EQ(entriesOf(listOfCopy), entries);
   ASSERT_EQ(listOfCopy->count, list->count);
   for (int i = 0; i < list->count; ++i) EXPECT_NE(listOfCopy->properties[i].value, list->properties[i].value);
 
-  ASSERT_EQ(copy->parse(object(kind.mergings[0].mine).c_str()), 0);
-  EXPECT_EQ(entriesOf(list), commonProperties());
-  EXPECT_EQ(kind.settings(*option), kind.common);
-
+  ASSERT_EQ(copy->parse(object(row.keys.begin()->name, "1").c_str()), 0);
+  EXPECT_EQ(entriesOf(list), entries);
   const auto last = option->clone();
   option.reset();
-  EXPECT_EQ(entriesOf(listOf(*last)), commonProperties()) << "when the original is gone";
+  EXPECT_EQ(entriesOf(listOf(*last)), entries) << "when the original is gone";
 }
 
 }  // namespace
