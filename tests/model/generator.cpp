@@ -9,38 +9,18 @@
 namespace oracle {
 namespace {
 
-struct Key {
-  const char* name;
-  int64_t low;  // of its range
+// Values that mostly are in a key's range, from `low` to `high`.
+struct Values {
+  int64_t low;
   int64_t high;
 };
-// The keys of a sensor's options, by sensor.
-const std::vector<Key> kKeys[kSensors] = {
-    {{"mode", 0, 1},
-     {"logN", 0, 8},
-     {"logM", 0, 8},
-     {"classMask", -1, 255},
-     {"summary", 0, 1},
-     {"weightVar", -1, 12},
-     {"continuous", 0, 1}},
-    {{"classMask", 1, 3}, {"level", -5, 5}},
-    {{"classMask", 1, 63}, {"level", -5, 5}},
-    {{"sensitivity", 0, 2}},
-    {{"classMask", 1, 15}},
-    {{"mode", 0, 1}, {"logN", 1, 100}},
-    {{"classMask", 1, 65535}},
-    {{"mode", 1, 4}, {"classMask", 1, 3}, {"level", -1, 1}, {"index", 0, 1}},
-    {{"classMask", 1, 3}},
-    {{"interval", -1, 10000}},
-    {{"userHeight", 100, 300},
-     {"floorHeight", 200, 800},
-     {"initX", -5, 5},
-     {"initY", -5, 5},
-     {"initFloor", -5, 5},
-     {"N", 0, 6},
-     {"6DOF", 0, 1}},
-    {{"classMask", 1, 3}},
-};
+Values usualValues(const model::Key& key) {
+  constexpr int64_t kLeast = std::numeric_limits<int32_t>::min();
+  constexpr int64_t kMost = std::numeric_limits<int32_t>::max();
+  if (key.low > key.high) return {0, key.defaultValue};
+  if (key.low == kLeast) return {0, 1};
+  return {key.low, key.high == kMost ? key.low + 12 : key.high};
+}
 
 constexpr const char* kNotIntegers[] = {"\"3\"", "2.0", "true", "null", "[1]", "{}", "1e2"};
 constexpr int64_t kOddIntegers[] = {-1,          31,
@@ -204,26 +184,26 @@ class Generator {
       return call;
     }
     auto& members = call.option.members;
-    for (const Key& key : kKeys[sensor]) {
+    const model::KindRow& row = model::rowOf(sensor);
+    for (const model::Key& key : row.keys) {
       if (!choices.oneIn(3) || (sensor == dtwgs && !choices.oneIn(6))) members.emplace_back(key.name, value(key));
     }
-    if (sensor == dtwgs) {
-      for (const char* key : {"template1", "template2"}) {
-        if (choices.oneIn(4)) members.emplace_back(key, choices.oneIn(8) ? oneOf(kNotIntegers) : templateText());
-      }
+    for (const char* key : row.stringKeys) {
+      if (choices.oneIn(4)) members.emplace_back(key, choices.oneIn(8) ? oneOf(kNotIntegers) : templateText());
     }
-    if (choices.oneIn(20)) members.emplace_back("colour", value({"", 0, 9}));
+    if (choices.oneIn(20)) members.emplace_back("colour", value({.name = "colour", .low = 0, .high = 9}));
     return call;
   }
 
-  std::string value(const Key& key) {
+  std::string value(const model::Key& key) {
+    const auto [low, high] = usualValues(key);
     const int kind = below(20);
     if (kind == 0) return oneOf(kNotIntegers);
     if (kind == 1) return std::to_string(oneOf(kOddIntegers));
-    if (kind == 2) return std::to_string(key.low - 1);
-    if (kind == 3) return std::to_string(key.high + 1);
-    if (std::strcmp(key.name, "mode") == 0 && key.high == 4) return choices.oneIn(3) ? "1" : "4";
-    return std::to_string(key.low + choices.below(static_cast<uint32_t>(key.high - key.low + 1)));
+    if (kind == 2) return std::to_string(low - 1);
+    if (kind == 3) return std::to_string(high + 1);
+    if (std::strcmp(key.name, "mode") == 0 && high == 4) return choices.oneIn(3) ? "1" : "4";
+    return std::to_string(low + choices.below(static_cast<uint32_t>(high - low + 1)));
   }
 
   std::string templateText() {
