@@ -5,7 +5,9 @@
 #include <algorithm>
 #include <array>
 #include <bit>
-#include <cstring>
+#include <cstdlib>
+#include <memory>
+#include <new>
 #include <string>
 #include <utility>
 #include <vector>
@@ -48,8 +50,15 @@ class Trial {
   Trial(const Trial&) = delete;
   Trial& operator=(const Trial&) = delete;
 
-  void make(const Call& call) {
-    for (void* handle : client.targets(call)) agree(call, handle, client.make(call, handle), {{}});
+  // Returns how many records the sessions delivered.
+  int make(const Call& call) {
+    int delivered = 0;
+    for (void* handle : client.targets(call)) {
+      const Observation observation = client.make(call, handle);
+      delivered += observation.outcome.delivers == Outcome::nothing ? 0 : 1;
+      agree(call, handle, observation, {{}});
+    }
+    return delivered;
   }
 
   // Makes the call with that allocation failing. Returns false if it does not make so many, and went well.
@@ -265,6 +274,41 @@ TEST(AllocationFailures, MakeTheCallsOfRandomSequencesFailAndChangeNothing) {
     failEachAllocation(sequence);
     if (HasFailure()) return;
   }
+}
+
+TEST(Allocations, AreWatchedWhicheverWayTheyAreMade) {
+  const memory::AllocationCount allocations;
+  const auto object = std::make_unique<uint64_t>();
+  const auto array = std::make_unique<uint64_t[]>(3);
+  std::free(std::realloc(std::malloc(4), 400));
+  std::free(std::calloc(4, 4));
+  EXPECT_EQ(allocations.made(), 5);
+  const memory::FailingAllocation second(2);
+  std::free(std::malloc(4));
+  EXPECT_FALSE(second.happened());
+  EXPECT_THROW(static_cast<void>(std::make_unique<uint64_t>()), std::bad_alloc);
+  EXPECT_TRUE(second.happened());
+}
+
+// Records are dispatched many times a second. A sequence has each sensor's records delivered, held back and refused.
+TEST(Allocations, AreNotMadeForARecord) {
+  std::array<int, kSensors> delivered{};
+  for (uint64_t seed = 0; seed < 400; ++seed) {
+    RandomChoices choices(seed);
+    const Sequence sequence = makeSequence(choices);
+    Trial trial;
+    for (const Call& call : sequence) {
+      // The first call after an uninit makes the sensors anew.
+      if (call.what == Call::uninit) continue;
+      const size_t before = memory::allocations();
+      const bool isRecord = call.what == Call::dispatch || call.what == Call::dispatchToSensor;
+      const int results = trial.make(call);
+      ASSERT_TRUE(!isRecord || memory::allocations() == before) << toJson(call) << " of\n" << toTrace(sequence);
+      if (call.what == Call::dispatchToSensor) delivered[static_cast<size_t>(call.sensor)] += results;
+    }
+    trial.closeAll();
+  }
+  for (size_t sensor = 0; sensor < delivered.size(); ++sensor) EXPECT_GT(delivered[sensor], 0) << kSensorNames[sensor];
 }
 
 // What holds the sessions grows now and then.

@@ -1,8 +1,8 @@
-#include "explain/nearest_name.h"
+#include "model/nearest_name.h"
 
 #include <gtest/gtest.h>
 
-namespace senseloom::tool {
+namespace senseloom::model {
 namespace {
 
 TEST(EditDistance, CountsInsertionsDeletionsAndReplacements) {
@@ -23,4 +23,4 @@ TEST(NearestName, IsTheFirstOfThoseWithTheLeastDistance) {
 }
 
 }  // namespace
-}  // namespace senseloom::tool
+}  // namespace senseloom::model

@@ -41,6 +41,7 @@ Blocks& liveBlocks() {
   return *blocks;
 }
 size_t live_bytes = 0;
+size_t asked_for = 0;
 
 int calls = 0;   // of the library that are under way
 int exempt = 0;  // objects of Exempt
@@ -53,6 +54,7 @@ bool has_failed = false;
 template <class Allocate>
 void* watched(size_t size, const Allocate& allocate) {
   if (calls == 0 || exempt > 0) return allocate();
+  ++asked_for;
   if (until_failure == 1) {
     has_failed = true;
     if (!fails_for_ever) until_failure = 0;
@@ -80,14 +82,6 @@ void* newBlock(size_t size) {
   return block;
 }
 
-class Watch {
- public:
-  Watch() { ++calls; }
-  ~Watch() { --calls; }
-  Watch(const Watch&) = delete;
-  Watch& operator=(const Watch&) = delete;
-};
-
 }  // namespace
 
 namespace memory {
@@ -101,6 +95,21 @@ void failAt(size_t which, bool forEver) {
 bool stopFailing() {
   until_failure = 0;
   return has_failed;
+}
+
+bool hasFailed() {
+  return has_failed;
+}
+
+size_t allocations() {
+  return asked_for;
+}
+
+Within::Within() {
+  ++calls;
+}
+Within::~Within() {
+  --calls;
 }
 
 Exempt::Exempt() {
@@ -171,7 +180,7 @@ void __wrap_free(void* block) {
 #define WATCHED(Result, function, parameters, arguments) \
   Result __real_##function parameters noexcept;          \
   Result __wrap_##function parameters noexcept {         \
-    const Watch watch;                                   \
+    const memory::Within call;                           \
     return __real_##function arguments;                  \
   }
 

@@ -11,6 +11,10 @@ namespace memory {
 void failAt(size_t which, bool forEver);
 // Lets no more fail. Returns whether any did.
 bool stopFailing();
+bool hasFailed();
+
+// How many allocations the library has asked for so far.
+size_t allocations();
 
 // While one lives, allocations are none of the library: it has called the platform.
 class Exempt {
@@ -19,6 +23,33 @@ class Exempt {
   ~Exempt();
   Exempt(const Exempt&) = delete;
   Exempt& operator=(const Exempt&) = delete;
+};
+
+// While one lives, allocations are those of the library: a test calls its classes without its entry points.
+class Within {
+ public:
+  Within();
+  ~Within();
+  Within(const Within&) = delete;
+  Within& operator=(const Within&) = delete;
+};
+
+// Counts the allocations during its life.
+class AllocationCount : Within {
+ public:
+  size_t made() const { return allocations() - before; }
+
+ private:
+  const size_t before = allocations();
+};
+
+// Lets one allocation during its life fail: the first, the second, ...
+class FailingAllocation : Within {
+ public:
+  explicit FailingAllocation(size_t which) { failAt(which, false); }
+  ~FailingAllocation() { stopFailing(); }
+  // Whether it came to that allocation.
+  bool happened() const { return hasFailed(); }
 };
 
 // Blocks that the library has allocated and that were not freed yet, and their bytes.

@@ -6,7 +6,7 @@
 #include <limits>
 #include <string>
 
-#include "allocations.h"
+#include "library_memory.h"
 #include "senseloom.h"
 
 namespace {
@@ -69,7 +69,7 @@ TEST_F(Array, IsNotMadeOfElementsWithoutASize) {
 TEST_F(Array, IsSetButHasNoStorageWhenMemoryRunsOut) {
   varray_t made = handMade(5, 6, nullptr);
   {
-    const fake::FailingAllocation first(1);
+    const memory::FailingAllocation first(1);
     EXPECT_EQ(_va_init(&made, 3), nullptr);
     EXPECT_TRUE(first.happened());
   }
@@ -131,7 +131,7 @@ TEST_F(Array, FailedGrowthChangesNothing) {
   void* const data = array.data;
   const std::string before = elements();
   {
-    const fake::FailingAllocation first(1);
+    const memory::FailingAllocation first(1);
     EXPECT_EQ(va_new(&array), nullptr);
     EXPECT_TRUE(first.happened());
   }
@@ -227,7 +227,7 @@ TEST_F(Array, AppendsNothingAfterItWasFreed) {
 TEST_F(Array, DoesNotGrowBeyondTwoToTheThirtiethSlots) {
   char memory[1];
   varray_t full = handMade(1 << 30, 1 << 30, memory);
-  const fake::AllocationCount allocations;
+  const memory::AllocationCount allocations;
   EXPECT_EQ(va_new(&full), nullptr);
   EXPECT_EQ(allocations.made(), 0U);
   expectRecord(full, 1 << 30, 1 << 30, 1, memory);

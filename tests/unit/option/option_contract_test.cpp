@@ -12,7 +12,7 @@
 #include <string>
 #include <vector>
 
-#include "allocations.h"
+#include "library_memory.h"
 #include "model/kinds.h"
 #include "model/merging.h"
 #include "model/option_reading.h"
@@ -261,7 +261,7 @@ TEST_P(OptionContract, RendersNullWhenMemoryRanOut) {
   const PropertyList other(Option::newOption(0));
   ctx_option_t* list = other.get();
   {
-    const fake::FailingAllocation memory(1);
+    const memory::FailingAllocation first(1);
     option->setProperty(&list);
   }
   EXPECT_EQ(list, nullptr);

@@ -7,7 +7,7 @@
 #include <set>
 #include <string>
 
-#include "allocations.h"
+#include "library_memory.h"
 #include "fake_option.h"
 #include "fake_platform.h"
 #include "fake_session.h"
@@ -63,7 +63,7 @@ TEST_F(Registry, IsInitialisedOnce) {
   _init_senseloom();
   ContextSensor* sensors[12];
   for (size_t i = 0; i < 12; ++i) sensors[i] = findSensor(kNames[i]);
-  const fake::AllocationCount allocations;
+  const memory::AllocationCount allocations;
   _init_senseloom();
   EXPECT_EQ(allocations.made(), 0U);
   for (size_t i = 0; i < 12; ++i) EXPECT_EQ(findSensor(kNames[i]), sensors[i]) << kNames[i];
@@ -125,7 +125,7 @@ TEST_F(Registry, UninitialisingNeitherTouchesSessionsNorStopsSensors) {
 TEST_F(Registry, MakesAllSensorsOrNone) {
   size_t failures = 0;
   for (;; ++failures) {
-    const fake::FailingAllocation next(failures + 1);
+    const memory::FailingAllocation next(failures + 1);
     try {
       _init_senseloom();
       break;

@@ -6,7 +6,7 @@
 #include <ostream>
 #include <set>
 
-#include "allocations.h"
+#include "library_memory.h"
 #include "random_numbers.h"
 
 namespace senseloom {
@@ -96,7 +96,7 @@ TEST(SessionSet, FindsNothingAtFirst) {
 TEST(SessionSet, RoomThatWasNotUsedIsKept) {
   SessionSet set;
   set.reserveOne();
-  const fake::AllocationCount allocations;
+  const memory::AllocationCount allocations;
   for (int i = 0; i < 100; ++i) set.reserveOne();
   EXPECT_EQ(allocations.made(), 0U);
   set.insert(sessionAt(16));
@@ -106,7 +106,7 @@ TEST(SessionSet, RoomThatWasNotUsedIsKept) {
 TEST(SessionSet, RoomOfErasedSessionsIsUsedAgain) {
   SessionSet set;
   insert(set, sessionAt(16));
-  const fake::AllocationCount allocations;
+  const memory::AllocationCount allocations;
   for (uintptr_t i = 2; i < 1000; ++i) {
     set.erase(sessionAt(16 * (i - 1)));
     insert(set, sessionAt(16 * i));
@@ -119,7 +119,7 @@ TEST(SessionSet, StaysAsItWasWhenItCannotGrow) {
   int failures = 0;
   for (uintptr_t i = 1; i <= 100; ++i) {
     {
-      const fake::FailingAllocation first(1);
+      const memory::FailingAllocation first(1);
       try {
         set.reserveOne();
       } catch (const std::bad_alloc&) {
