@@ -2,6 +2,7 @@
 // engine says of it, two bytes of length, and the bytes.
 
 #include <algorithm>
+#include <iterator>
 #include <string>
 #include <utility>
 
@@ -13,7 +14,7 @@ constexpr size_t kMostBytes = 2100;
 constexpr size_t kHead = 3;
 
 // Options that make a difference to what is done with records.
-constexpr const char* kOptions[oracle::kSensors][4] = {
+constexpr const char* kOptions[][4] = {
     {R"({"logN":2,"mode":1,"weightVar":1})", R"({"logN":8,"weightVar":0})", R"({"logN":3,"summary":0,"classMask":6})",
      R"({"logN":5,"weightVar":0,"mode":1})"},
     {R"({"classMask":1})", R"({"classMask":2})", R"({"level":6})", "{}"},
@@ -28,19 +29,20 @@ constexpr const char* kOptions[oracle::kSensors][4] = {
     {R"({"N":2})", R"({"N":6})", R"({"N":1})", "{}"},
     {"{}", R"({"classMask":1})", "x", "[]"},
 };
+static_assert(std::size(kOptions) == oracle::kSensors, "a row for each sensor");
 
 // What the gesture engine says: a gesture in the record's first or second group, or none that counts.
 constexpr const char* kNames[] = {nullptr, "NumberOne ", "LetterA ", "LetterF ", "LetterA"};
 
 }  // namespace
 
-int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  if (size < 2) return 0;
-  const int sensor = fuzz::sensorOf(data[0]);
+void fuzz::records(const uint8_t* data, size_t size) {
+  if (size < 2) return;
+  const int sensor = sensorOf(data[0]);
   // Without an option on any session of the sensor, records take another way.
-  oracle::Sequence sequence = {fuzz::openCall(0, sensor), fuzz::openCall(1, sensor)};
+  oracle::Sequence sequence = {openCall(0, sensor), openCall(1, sensor)};
   const uint8_t option = static_cast<uint8_t>(data[1] - 'a');
-  if (option < 8) sequence.push_back(fuzz::optionCall(option / 4, kOptions[sensor][option % 4]));
+  if (option < 8) sequence.push_back(optionCall(option / 4, kOptions[sensor][option % 4]));
   for (size_t at = 2; at + kHead <= size;) {
     oracle::Call call;
     call.what = oracle::Call::dispatchToSensor;
@@ -55,6 +57,5 @@ int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     at += length;
     sequence.push_back(std::move(call));
   }
-  fuzz::check(sequence);
-  return 0;
+  check(sequence);
 }

@@ -25,8 +25,7 @@ class InputChoices final : public oracle::Choices {
 
 }  // namespace
 
-int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+void fuzz::sequences(const uint8_t* data, size_t size) {
   InputChoices choices(data, size);
-  fuzz::check(oracle::makeSequence(choices));
-  return 0;
+  check(oracle::makeSequence(choices));
 }

@@ -8,10 +8,13 @@
 #include <cstdlib>
 
 // What every fuzz target does with an input: it becomes a sequence of calls, and the library has to do in them what the
-// model says. The fuzzer knows the entry point by its name.
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size);
-
+// model says.
 namespace fuzz {
+
+// The targets. A build of one as a fuzzer names it in FUZZ_TARGET.
+void options(const uint8_t* data, size_t size);
+void records(const uint8_t* data, size_t size);
+void sequences(const uint8_t* data, size_t size);
 
 inline oracle::Call openCall(int session, int sensor) {
   oracle::Call call;

@@ -238,32 +238,34 @@ TEST_P(AllocationFailure, MakesTheCallFailAndChangesNothing) {
   }
 }
 
-INSTANTIATE_TEST_SUITE_P(
-    Sensors, AllocationFailure,
-    ::testing::Values(SensorCase{phyac,
-                                 {R"({"logN":3,"logM":1})", R"({"logN":2,"mode":1,"summary":0})"},
-                                 {6, 0, 0x51, 0, 0x62, 0, 0x71, 0, 0x82, 0, 0x91, 0, 0xA1, 0}},
-                      SensorCase{stap, {R"({"classMask":1,"level":-2})", R"({"classMask":9})"}, {1, 0}},
-                      SensorCase{gsflk, {R"({"classMask":32,"level":7})", R"({"level":2})"}, {6, 0}},
-                      SensorCase{shaki, {R"({"sensitivity":0})", R"({"sensitivity":3})"}, {1, 0}},
-                      SensorCase{isact, {R"({"classMask":1})", R"({"classMask":6})"}, {2, 0, 0, 0}},
-                      SensorCase{scoun, {R"({"mode":0,"logN":2})", R"({"mode":0})"}, {100, 0, 0, 0}},
-                      SensorCase{gspx,
-                                 {R"({"classMask":1024})", R"({"classMask":1025})"},
-                                 {0, 0, 14, 0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13, 14},
-                                 {"NumberOne ", "LetterA "}},
-                      SensorCase{dtwgs,
-                                 {R"({"mode":4,"classMask":3,"template1":"0003a1b2c3"})",
-                                  R"({"mode":4,"classMask":2,"level":-1,"template2":"0001ff"})"},
-                                 {1, 0}},
-                      SensorCase{gseth, {R"({"classMask":1})", R"({"classMask":2})"}, {2, 0}},
-                      SensorCase{lpe, {R"({"interval":1})", R"({"interval":2})"}, {1, 0}},
-                      SensorCase{pdr,
-                                 {R"({"N":1,"userHeight":170,"6DOF":1})", R"({"N":2})"},
-                                 {1,  0,  1,  2,  3,  4,  5,  6,  7,  8,  9,  10, 11, 12, 13,
-                                  14, 15, 16, 17, 18, 19, 20, 21, 22, 23, 24, 25, 26, 27, 28}},
-                      SensorCase{lift, {R"({"classMask":1})", "{}"}, {1, 0}}),
-    [](const auto& sensor) { return kSensorNames[sensor.param.sensor]; });
+const SensorCase kSensorCases[] = {
+    {phyac,
+     {R"({"logN":3,"logM":1})", R"({"logN":2,"mode":1,"summary":0})"},
+     {6, 0, 0x51, 0, 0x62, 0, 0x71, 0, 0x82, 0, 0x91, 0, 0xA1, 0}},
+    {stap, {R"({"classMask":1,"level":-2})", R"({"classMask":9})"}, {1, 0}},
+    {gsflk, {R"({"classMask":32,"level":7})", R"({"level":2})"}, {6, 0}},
+    {shaki, {R"({"sensitivity":0})", R"({"sensitivity":3})"}, {1, 0}},
+    {isact, {R"({"classMask":1})", R"({"classMask":6})"}, {2, 0, 0, 0}},
+    {scoun, {R"({"mode":0,"logN":2})", R"({"mode":0})"}, {100, 0, 0, 0}},
+    {gspx,
+     {R"({"classMask":1024})", R"({"classMask":1025})"},
+     {0, 0, 14, 0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13, 14},
+     {"NumberOne ", "LetterA "}},
+    {dtwgs,
+     {R"({"mode":4,"classMask":3,"template1":"0003a1b2c3"})",
+      R"({"mode":4,"classMask":2,"level":-1,"template2":"0001ff"})"},
+     {1, 0}},
+    {gseth, {R"({"classMask":1})", R"({"classMask":2})"}, {2, 0}},
+    {lpe, {R"({"interval":1})", R"({"interval":2})"}, {1, 0}},
+    {pdr,
+     {R"({"N":1,"userHeight":170,"6DOF":1})", R"({"N":2})"},
+     {1, 0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13, 14, 15, 16, 17, 18, 19, 20, 21, 22, 23, 24, 25, 26, 27, 28}},
+    {lift, {R"({"classMask":1})", "{}"}, {1, 0}},
+};
+static_assert(std::size(kSensorCases) == kSensors, "a case for each sensor");
+
+INSTANTIATE_TEST_SUITE_P(Sensors, AllocationFailure, ::testing::ValuesIn(kSensorCases),
+                         [](const auto& sensor) { return kSensorNames[sensor.param.sensor]; });
 
 TEST(AllocationFailures, MakeTheCallsOfRandomSequencesFailAndChangeNothing) {
   for (uint64_t seed = 0; seed < 10; ++seed) {
