@@ -1,18 +1,15 @@
 #pragma once
 
-#include <array>
+#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <initializer_list>
+#include <iterator>
 #include <limits>
 #include <string_view>
 
-// What is data about the twelve sensors: a table of the model's own, which shares nothing with the library.
+// What is data about the sensors: a table of the model's own, which shares nothing with the library.
 namespace senseloom::model {
-
-// The sensors in the library's order.
-enum Kind { phyac, stap, gsflk, shaki, isact, scoun, gspx, dtwgs, gseth, lpe, pdr, lift };
-inline constexpr int kKinds = lift + 1;
 
 // What becomes of a value out of its key's range.
 enum class OutOfRange {
@@ -76,7 +73,8 @@ struct KindRow {
   bool acceptsNotJson = false;    // such a text changes nothing, but the sensor negotiates
 };
 
-inline constexpr KindRow kKindTable[kKinds] = {
+// In the library's order. A kind is its place here.
+inline constexpr KindRow kKindTable[] = {
     {.sensor = "PHYAC",
      .keys = {{.name = "mode", .merge = Rule::allOne},
               {.name = "logN", .low = 0, .high = 8, .outOfRange = OutOfRange::clamped, .merge = Rule::minimum},
@@ -233,8 +231,7 @@ inline constexpr KindRow kKindTable[kKinds] = {
                .merge = Rule::bitOr}},
      .properties = {{201, "classMask", "classMask"}}},
 };
-static_assert(kKindTable[lift].sensor != nullptr, "a row for each kind");
-
+inline constexpr int kKinds = static_cast<int>(std::size(kKindTable));
 inline constexpr size_t kMostKeys = 7;
 
 constexpr const KindRow& rowOf(int kind) {
@@ -245,8 +242,36 @@ constexpr const Key& keyOf(int kind, size_t index) {
 }
 
 // The sensor with that name; -1 when there is none.
-int kindNamed(std::string_view sensor);
+constexpr int kindNamed(std::string_view sensor) {
+  for (int kind = 0; kind < kKinds; ++kind) {
+    if (rowOf(kind).sensor == sensor) return kind;
+  }
+  return -1;
+}
+
+// The kinds that code tells apart.
+enum Kind {
+  phyac = kindNamed("PHYAC"),
+  stap = kindNamed("STAP"),
+  gsflk = kindNamed("GSFLK"),
+  shaki = kindNamed("SHAKI"),
+  isact = kindNamed("ISACT"),
+  scoun = kindNamed("SCOUN"),
+  gspx = kindNamed("GSPX"),
+  dtwgs = kindNamed("DTWGS"),
+  gseth = kindNamed("GSETH"),
+  lpe = kindNamed("LPE_P"),
+  pdr = kindNamed("PDR"),
+  lift = kindNamed("LIFT"),
+};
+
 // The place of a key in its kind's row; the number of keys when there is no such key.
-size_t keyIndex(int kind, std::string_view key);
+constexpr size_t keyIndex(int kind, std::string_view key) {
+  size_t index = 0;
+  while (index < rowOf(kind).keys.size() && keyOf(kind, index).name != key) ++index;
+  return index;
+}
+
+static_assert(std::ranges::all_of(kKindTable, [](const KindRow& row) { return row.keys.size() <= kMostKeys; }));
 
 }  // namespace senseloom::model

@@ -14,23 +14,12 @@ constexpr int32_t kEnroll = 1;
 constexpr int32_t kMatch = 4;
 
 int32_t mergedValue(Rule rule, int32_t mine, int32_t other) {
-  switch (rule) {
-    case Rule::bitOr:
-      return mine | other;
-    case Rule::minimum:
-      return std::min(mine, other);
-    case Rule::maximum:
-      return std::max(mine, other);
-    case Rule::allOne:
-      return mine == 1 && other == 1 ? 1 : 0;
-    case Rule::anySet:
-      return mine != 0 || other != 0 ? 1 : 0;
-    case Rule::keepFirst:
-      return mine;
-    case Rule::takeLast:
-      return other;
-  }
-  return mine;
+  if (rule == Rule::bitOr) return mine | other;
+  if (rule == Rule::minimum) return std::min(mine, other);
+  if (rule == Rule::maximum) return std::max(mine, other);
+  if (rule == Rule::allOne) return mine == 1 && other == 1 ? 1 : 0;
+  if (rule == Rule::anySet) return mine != 0 || other != 0 ? 1 : 0;
+  return rule == Rule::takeLast ? other : mine;
 }
 
 Property property(int32_t id, int32_t value) {
