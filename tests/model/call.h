@@ -1,7 +1,5 @@
 #pragma once
 
-#include <array>
-#include <cstddef>
 #include <optional>
 #include <string>
 #include <utility>
@@ -22,11 +20,14 @@ using model::Bytes;
 // The sensors in the library's order; a call names one by its place here.
 using enum model::Kind;
 constexpr int kSensors = model::kKinds;
-constexpr auto kSensorNames = [] {
-  std::array<const char*, kSensors> names{};
-  for (size_t i = 0; i < names.size(); ++i) names[i] = model::kKindTable[i].sensor;
-  return names;
+inline constexpr struct SensorNames {
+  const char* names[kSensors];
+} kSensorNameList = [] {
+  SensorNames list{};
+  for (int sensor = 0; sensor < kSensors; ++sensor) list.names[sensor] = model::rowOf(sensor).sensor;
+  return list;
 }();
+inline constexpr auto& kSensorNames = kSensorNameList.names;
 
 // An option string: members with their values as JSON text, or text as it stands, or a null pointer.
 struct OptionText {

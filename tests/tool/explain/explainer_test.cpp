@@ -16,10 +16,11 @@ namespace {
 // Tells an explainer of calls of session "a" on a sensor, as if a library had returned what the test says.
 class Explaining {
  public:
-  Explaining(std::FILE* out, const char* sensor) : layout(findRecordLayout(sensor)), explainer(out, log, false) {
-    explainer.onOutcome({.call = callOf(CallKind::open), .session = name, .sensor = layout});
-  }
+  Explaining(std::FILE* out, const char* sensor) : layout(findRecordLayout(sensor)), explainer(out, log, false) {}
 
+  void open(bool opens = true) {
+    explainer.onOutcome({.call = callOf(CallKind::open), .session = name, .sensor = layout, .failed = !opens});
+  }
   void set(const std::string& option, int returned, std::optional<PropertyList> properties) {
     TraceCall call = callOf(CallKind::setOption);
     call.option = option;
@@ -65,6 +66,7 @@ Property property(int32_t id, uint8_t value) {
 std::string explained(const char* sensor, const std::function<void(Explaining&)>& calls) {
   return printed([&](std::FILE* out) {
     Explaining explaining(out, sensor);
+    explaining.open();
     calls(explaining);
   });
 }
@@ -168,6 +170,21 @@ TEST(Explainer, SaysWhenOtherBytesAreDelivered) {
             "what became of the records\n"
             "  session  sensor  records  delivered  unexplained\n"
             "  a        STAP          2          0            2\n");
+}
+
+TEST(Explainer, SaysWhenASessionOpensOrNotWithoutAReason) {
+  EXPECT_EQ(printed([](std::FILE* out) {
+              Explaining a(out, "STAP");
+              a.open(false);
+            }),
+            "line 7: a on STAP does not open\n"
+            "  unexplained: the library opened no session, where one was derived\n");
+  EXPECT_EQ(printed([](std::FILE* out) {
+              Explaining a(out, "LPE_P");
+              __android_log_print(ANDROID_LOG_ERROR, "aware_audio", "activated aware failed\n");
+              a.open();
+            }),
+            "line 7: a on LPE_P unexplained: opens, where no session was derived\n");
 }
 
 TEST(Explainer, TakesALineThatThePlatformCutAsLogged) {
