@@ -1,12 +1,12 @@
 #include "audio/audio_hal.h"
 
 #include <android/log.h>
+#include <hardware/aware.h>
 #include <hardware/hardware.h>
 
 #include <cstdio>
 #include <cstring>
 
-#include "audio/aware_device.h"
 #include "senseloom.h"
 
 // Every call of the platform, and the log is one, may clear what callers see, too: it is read anew after each.
@@ -17,12 +17,12 @@ namespace senseloom {
 namespace {
 
 constexpr const char* kTag = "aware_audio";
-constexpr const char* kClass = "aware";
+constexpr const char* kClass = AWARE_HARDWARE_MODULE_ID;
 constexpr const char* kInstance = "primary";
-constexpr const char* kInterface = "aware_hw_if";
-constexpr uint32_t kVersion = 0x200;  // device API version 2.0
+constexpr const char* kInterface = AWARE_HARDWARE_INTERFACE;
+constexpr uint32_t kVersion = AWARE_DEVICE_API_VERSION_2_0;
 
-constexpr AwareParameters kParameters = {
+constexpr aware_parameters_t kParameters = {
     .word0 = 128,
     .half4 = 12,
     .half6 = 20,

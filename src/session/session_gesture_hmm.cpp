@@ -1,13 +1,13 @@
 #include "session/session_gesture_hmm.h"
 
 #include <android/log.h>
+#include <gesture.h>
 
 #include <algorithm>
 #include <array>
 #include <cstring>
 #include <memory>
 
-#include "session/gesture_engine.h"
 #include "session/record.h"
 
 namespace senseloom {

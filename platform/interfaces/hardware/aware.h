@@ -16,7 +16,7 @@ extern "C" {
 #define AWARE_HARDWARE_INTERFACE "aware_hw_if"
 #define AWARE_DEVICE_API_VERSION_2_0 HARDWARE_DEVICE_API_VERSION(2, 0)
 
-/* What a session is activated with. What the fields mean is the hardware's affair; they are named by their offset. */
+/* What a session is activated with. The meaning of the fields is undocumented; they are named by their offset. */
 typedef struct aware_parameters {
   int32_t word0;
   int16_t half4;
@@ -46,13 +46,18 @@ typedef struct aware_hw_device {
   /* Ends the session. Returns 0, or -EINVAL when it is not active. */
   int (*deactivate)(struct aware_hw_device* device);
 
-  /* Copies the parameters that the session was activated with. Returns 0, or -EINVAL when it is not active. */
+  /*
+   * Copies the parameters that the session was activated with. Returns 0, or -EINVAL when it is not active. Of the host's
+   * module alone; libsenseloom does not call it.
+   */
   int (*get_parameters)(const struct aware_hw_device* device, aware_parameters_t* parameters);
 } aware_hw_device_t;
 
 #ifdef __cplusplus
-static_assert(offsetof(aware_parameters_t, word12) == 12, "two bytes of padding");
-static_assert(offsetof(aware_parameters_t, half44) == 44, "no further padding");
+static_assert(offsetof(aware_parameters_t, half8) == 8 && offsetof(aware_parameters_t, word12) == 12,
+              "two bytes of padding after half8");
+static_assert(offsetof(aware_parameters_t, word40) == 40 && offsetof(aware_parameters_t, half46) == 46,
+              "no further padding");
 static_assert(sizeof(aware_parameters_t) == 48, "parameters are exchanged in binary form");
 static_assert(offsetof(aware_hw_device_t, activate) == sizeof(hw_device_t), "operations follow the common header");
 static_assert(offsetof(aware_hw_device_t, deactivate) == sizeof(hw_device_t) + sizeof(void*),
