@@ -12,7 +12,7 @@ namespace {
 
 using senseloom::tool::compactText;
 using senseloom::tool::encodeRecord;
-using senseloom::tool::findRecordLayout;
+using senseloom::tool::findSensor;
 using senseloom::tool::fromHex;
 using senseloom::tool::InputError;
 
@@ -137,7 +137,7 @@ Answers answersOf(json_t* object) {
 Bytes recordOf(const json_t* object, int sensor) {
   json_t* record = json_object_get(object, "record");
   if (!json_is_object(record)) throw InputError("\"record\" must be an object");
-  return encodeRecord(*findRecordLayout(kSensorNames[sensor]), record);
+  return encodeRecord(*findSensor(kSensorNames[sensor]), record);
 }
 
 }  // namespace

@@ -90,7 +90,7 @@ Json propertiesAs(const json_t* expected, int sensor, const PropertyList& list) 
 
 // By field when the fields tell all bytes; a result that replaces a field of its record tells the rest with that.
 Json resultAs(const json_t* expected, int sensor, const Bytes& record, const Bytes& result) {
-  const auto& layout = *senseloom::tool::findRecordLayout(kSensorNames[sensor]);
+  const auto& layout = *senseloom::tool::findSensor(kSensorNames[sensor]);
   Json hex(json_pack("{s:s}", "hex", senseloom::tool::toHex(result).c_str()));
   if (json_object_get(expected, "hex") != nullptr) return hex;
   Json fields = senseloom::tool::decodeResult(layout, result);

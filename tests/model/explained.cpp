@@ -12,7 +12,7 @@
 #include "client.h"
 #include "explain/explainer.h"
 #include "input_error.h"
-#include "replay/replayer.h"
+#include "trace/replayer.h"
 #include "trace/hex.h"
 
 namespace oracle {
@@ -46,7 +46,7 @@ tool::TraceCall traceCallOf(const Call& call, size_t line) {
   trace.kind = kindOf(call);
   trace.session = "s" + std::to_string(call.session);
   if (call.what == Call::open || call.what == Call::dispatchToSensor) {
-    trace.sensor = tool::findRecordLayout(kSensorNames[static_cast<size_t>(call.sensor)]);
+    trace.sensor = tool::findSensor(kSensorNames[static_cast<size_t>(call.sensor)]);
   }
   if (call.what == Call::setOption && !call.option.isNull) trace.option = call.option.text();
   trace.record.reset(json_pack("{s:s}", "hex", tool::toHex(call.record).c_str()));

@@ -3,10 +3,30 @@
 #include <cerrno>
 #include <cstddef>
 #include <new>
+#include <span>
 #include <string>
 
 namespace senseloom::trace {
+
+using tool::CallKind;
+using tool::callName;
+using tool::TraceLine;
+namespace member = tool::member;
+
 namespace {
+
+std::span<const uint8_t> bytesOf(const void* data, int32_t size) {
+  return {static_cast<const uint8_t*>(data), static_cast<size_t>(size)};
+}
+
+void addProperties(TraceLine& line, const ctx_option_t& list) {
+  line.beginArray(member::kProperties);
+  for (int32_t i = 0; i < list.count; ++i) {
+    const ctx_property_t& property = list.properties[i];
+    line.addProperty(property.id, bytesOf(property.value, property.size));
+  }
+  line.endArray();
+}
 
 std::string sessionName(uint32_t number) {
   return 's' + std::to_string(number);
@@ -21,32 +41,28 @@ void Recorder::opened(const char* sensor, bool exists, void* handle) noexcept {
     if (exists) {
       const uint32_t number = ++sessions;
       if (handle != nullptr) numbers[handle] = number;
-      line.addText("call", "open");
-      line.addText("session", sessionName(number));
+      line.addText(member::kCall, callName(CallKind::open));
+      line.addText(member::kSession, sessionName(number));
     } else {
-      line.addText("note", "open of a sensor that does not exist");
+      line.addText(member::kNote, "open of a sensor that does not exist");
     }
     if (sensor != nullptr) {
-      line.addText("sensor", sensor);
+      line.addText(member::kSensor, sensor);
     } else {
-      line.addNull("sensor");
+      line.addNull(member::kSensor);
     }
-    if (handle != nullptr) {
-      line.addText("returned", "handle");
-    } else {
-      line.addNull("returned");
-    }
+    line.addOpened(handle != nullptr);
     end();
   });
 }
 
 void Recorder::beforeSetOption(void* handle, const char* option, ctx_option_t** out) noexcept {
   attempt([=, this] {
-    if (!begin("set_option", handle, out != nullptr)) return;
+    if (!begin(CallKind::setOption, handle, out != nullptr)) return;
     if (option != nullptr) {
-      line.addText("option", option);
+      line.addText(member::kOption, option);
     } else {
-      line.addNull("option");
+      line.addNull(member::kOption);
       hasResult = false;
     }
   });
@@ -54,20 +70,20 @@ void Recorder::beforeSetOption(void* handle, const char* option, ctx_option_t** 
 
 void Recorder::beforeDispatch(void* handle, const void* data, int len, void** out, const int* outlen) noexcept {
   attempt([=, this] {
-    if (!begin("dispatch", handle, data != nullptr && len >= 0 && out != nullptr && outlen != nullptr)) return;
-    line.addBytes("record", {static_cast<const uint8_t*>(data), static_cast<size_t>(len)});
+    if (!begin(CallKind::dispatch, handle, data != nullptr && len >= 0 && out != nullptr && outlen != nullptr)) return;
+    line.addBytes(member::kRecord, bytesOf(data, len));
   });
 }
 
 void Recorder::beforeClose(void* handle, ctx_option_t** out) noexcept {
-  attempt([=, this] { begin("close", handle, out != nullptr); });
+  attempt([=, this] { begin(CallKind::close, handle, out != nullptr); });
 }
 
 void Recorder::negotiated(int returned, ctx_option_t** out) noexcept {
   attempt([=, this] {
     if (line.isEmpty()) return;
-    line.addInteger("returned", returned);
-    if (hasResult && *out != nullptr) line.addProperties("properties", **out);
+    line.addReturned(returned);
+    if (hasResult && *out != nullptr) addProperties(line, **out);
     end();
   });
 }
@@ -75,9 +91,9 @@ void Recorder::negotiated(int returned, ctx_option_t** out) noexcept {
 void Recorder::dispatched(int returned, void** out, const int* outlen) noexcept {
   attempt([=, this] {
     if (line.isEmpty()) return;
-    line.addInteger("returned", returned);
+    line.addReturned(returned);
     if (hasResult && returned == 1) {
-      line.addBytes("result", {static_cast<const uint8_t*>(*out), static_cast<size_t>(*outlen)});
+      line.addBytes(member::kResult, bytesOf(*out, *outlen));
     }
     end();
   });
@@ -92,7 +108,7 @@ void Recorder::uninitialised() noexcept {
   attempt([this] {
     if (!file.isWanted()) return;
     line.clear();
-    line.addText("call", "uninit");
+    line.addText(member::kCall, callName(CallKind::uninit));
     end();
   });
 }
@@ -111,17 +127,18 @@ void Recorder::attempt(Step step) noexcept {
 }
 
 // Begins the line of a call on a session; returns whether it is a call that can be made again.
-bool Recorder::begin(const char* call, void* handle, bool hasArguments) {
+bool Recorder::begin(CallKind call, void* handle, bool hasArguments) {
   line.clear();
   if (!file.isWanted()) return false;
   const auto session = numbers.find(handle);
   hasResult = session != numbers.end() && hasArguments;
   if (hasResult) {
-    line.addText("call", call);
-    line.addText("session", sessionName(session->second));
+    line.addText(member::kCall, callName(call));
+    line.addText(member::kSession, sessionName(session->second));
   } else {
-    line.addText("note", std::string(call) +
-                             (session == numbers.end() ? " on a handle that is not open" : " without an argument"));
+    line.addText(member::kNote,
+                 std::string(callName(call)) +
+                     (session == numbers.end() ? " on a handle that is not open" : " without an argument"));
   }
   return hasResult;
 }

@@ -3,8 +3,10 @@
 #include <cstdint>
 #include <unordered_map>
 
+#include "senseloom.h"
+#include "trace/trace_form.h"
+#include "trace/trace_line.h"
 #include "trace_file.h"
-#include "trace_line.h"
 
 namespace senseloom::trace {
 
@@ -35,11 +37,11 @@ class Recorder {
  private:
   template <class Step>
   void attempt(Step step) noexcept;
-  bool begin(const char* call, void* handle, bool hasArguments);
+  bool begin(tool::CallKind call, void* handle, bool hasArguments);
   void end();
 
   TraceFile file;
-  TraceLine line;          // the call that is being made; empty when it is not to be written
+  tool::TraceLine line;    // the call that is being made; empty when it is not to be written
   bool hasResult = false;  // ... and whether the library looks at where its result is to go
   uint32_t sessions = 0;   // that were ever opened
   std::unordered_map<const void*, uint32_t> numbers;

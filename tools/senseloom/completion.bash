@@ -2,7 +2,6 @@
 # shellcheck shell=bash
 
 _senseloom() {
-  local sensors="PHYAC STAP GSFLK SHAKI ISACT SCOUN GSPX DTWGS GSETH LPE_P PDR LIFT"
   # Options of each command, and what else may follow it. Where nothing of that fits, a file may.
   local -A options=(
     [senseloom]="--help --version"
@@ -15,9 +14,7 @@ _senseloom() {
   )
   local -A words=(
     [senseloom]="replay explain record generate sensors"
-    [explain]=$sensors
     [generate]="commute"
-    [sensors]=$sensors
   )
   local current=${COMP_WORDS[COMP_CWORD]} command="" candidates longer word
   for word in "${COMP_WORDS[@]:1:COMP_CWORD-1}"; do
@@ -31,7 +28,15 @@ _senseloom() {
     --output | -o | --plot) return ;; # a file
     --seed | --class-names) return ;; # whatever one likes
     --) candidates=$(compgen -c) ;;
-    *) if [[ $current == -* ]]; then candidates=${options[$command]}; else candidates=${words[$command]-}; fi ;;
+    *)
+      if [[ $current == -* ]]; then
+        candidates=${options[$command]}
+      elif [[ $command == explain || $command == sensors ]]; then
+        candidates=$("${COMP_WORDS[0]}" sensors --json 2>/dev/null | sed 's/^{"sensor":"\([^"]*\)".*/\1/')
+      else
+        candidates=${words[$command]-}
+      fi
+      ;;
   esac
   mapfile -t COMPREPLY < <(compgen -W "$candidates" -- "$current")
 }

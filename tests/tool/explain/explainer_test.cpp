@@ -16,7 +16,7 @@ namespace {
 // Tells an explainer of calls of session "a" on a sensor, as if a library had returned what the test says.
 class Explaining {
  public:
-  Explaining(std::FILE* out, const char* sensor) : layout(findRecordLayout(sensor)), explainer(out, log, false) {}
+  Explaining(std::FILE* out, const char* sensor) : layout(findSensor(sensor)), explainer(out, log, false) {}
 
   void open(bool opens = true) {
     explainer.onOutcome({.call = callOf(CallKind::open), .session = name, .sensor = layout, .failed = !opens});
@@ -54,7 +54,7 @@ class Explaining {
   }
 
   const std::string name = "a";
-  const RecordLayout* layout;
+  const Sensor* layout;
   LogCapture log;
   Explainer explainer;
 };

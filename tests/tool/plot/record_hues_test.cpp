@@ -10,7 +10,7 @@ namespace senseloom::tool {
 namespace {
 
 RecordHues look(const char* sensor, const std::string& value, bool isResult = false) {
-  return recordLookOf(*findRecordLayout(sensor)).look(*fromHex("0000000000000000" + value), isResult);
+  return huesOf(sensorNamed(sensor), *fromHex("0000000000000000" + value), isResult);
 }
 
 TEST(RecordHuesOf, ActivityAreThoseOfItsItems) {
@@ -38,11 +38,13 @@ TEST(RecordHuesOf, CountsAreHeights) {
   EXPECT_EQ(look("SCOUN", "64000000").height, 100U);
   EXPECT_EQ(look("SCOUN", "00000080").height, 2147483648U);
   EXPECT_EQ(look("PDR", "0300").height, 3U);
+  EXPECT_EQ(look("PDR", "fdff").height, 3U);
+  EXPECT_EQ(look("PDR", "03").height, 0U);  // too short for its number
 }
 
 TEST(HueText, NamesWhatAHueStandsFor) {
   const auto text = [](const char* sensor, size_t hue, const std::vector<std::string>& names = {}) {
-    return hueText(recordLookOf(*findRecordLayout(sensor)), hue, names);
+    return hueText(sensorNamed(sensor), hue, names);
   };
   EXPECT_EQ(text("PHYAC", 1), "class 1");
   EXPECT_EQ(text("PHYAC", 1, {"still", "walking"}), "walking");

@@ -18,7 +18,7 @@ void printAccounts(std::FILE* out, const std::vector<Account>& accounts) {
   std::vector<TextRow> rows(1 + accounts.size());
   rows[0] = {"session", "sensor", "records"};
   for (size_t i = 0; i < accounts.size(); ++i) {
-    rows[1 + i] = {accounts[i].session, accounts[i].sensor->sensor, std::to_string(accounts[i].records())};
+    rows[1 + i] = {accounts[i].session, accounts[i].sensor->name, std::to_string(accounts[i].records())};
   }
   const auto addColumn = [&](const char* title, auto count) {
     rows[0].push_back(title);

@@ -9,8 +9,8 @@
 #include "input_error.h"
 #include "plot/replay_plot.h"
 #include "replay/replay_progress.h"
-#include "replay/replayer.h"
 #include "trace/json.h"
+#include "trace/replayer.h"
 #include "trace/trace_reader.h"
 
 namespace senseloom::tool {
@@ -35,10 +35,7 @@ std::string sessionName(size_t index) {
 }  // namespace
 
 void explainOptions(std::FILE* out, const std::string& sensor, const std::vector<std::string>& options) {
-  const RecordLayout* layout = findRecordLayout(sensor);
-  if (layout == nullptr) {
-    throw InputError("unknown sensor \"" + sensor + "\": `senseloom sensors` prints those that are known");
-  }
+  const Sensor* layout = &sensorNamed(sensor);
   if (options.empty()) throw InputError("no option string for a session on " + sensor);
   LogCapture log;
   Explainer explainer(out, log, false);

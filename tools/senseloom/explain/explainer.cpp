@@ -55,7 +55,7 @@ void Explainer::onEnd() {
 void Explainer::open(const CallOutcome& outcome) {
   Account& account = accountOf(outcome.session, outcome.sensor);
   const Session& session = sessions.emplace_back(Session{outcome.session, outcome.sensor});
-  const bool isExpected = model.open(outcome.sensor->sensor, &session).returned == 1;
+  const bool isExpected = model.open(outcome.sensor->name, &session).returned == 1;
   if (!outcome.failed) {
     account.chain = model.chain(&session);
     if (!isExpected) printBlock(outcome, "unexplained: opens, where no session was derived");
@@ -208,10 +208,10 @@ void Explainer::printBlock(const CallOutcome& outcome, const std::string& what) 
 void Explainer::printLine(const CallOutcome& outcome, const std::string& what) {
   begun = true;
   if (outcome.call.line != 0) std::fprintf(out, "line %zu: ", outcome.call.line);
-  std::fprintf(out, "%s on %s %s\n", outcome.session.c_str(), outcome.sensor->sensor, what.c_str());
+  std::fprintf(out, "%s on %s %s\n", outcome.session.c_str(), outcome.sensor->name, what.c_str());
 }
 
-Account& Explainer::accountOf(const std::string& session, const RecordLayout* sensor) {
+Account& Explainer::accountOf(const std::string& session, const Sensor* sensor) {
   const auto known = std::find_if(accounts.begin(), accounts.end(), [&](const Account& account) {
     return account.session == session && account.sensor == sensor;
   });

@@ -8,7 +8,7 @@
 #include "explain/account_output.h"
 #include "explain/log_capture.h"
 #include "model/model.h"
-#include "replay/replayer.h"
+#include "trace/replayer.h"
 
 namespace senseloom::tool {
 
@@ -29,7 +29,7 @@ class Explainer final : public ReplayObserver {
   // Its address is its handle in the model.
   struct Session {
     std::string name;
-    const RecordLayout* sensor;
+    const Sensor* sensor;
     model::ItemCounts items = {};
   };
   using SessionIterator = std::list<Session>::iterator;
@@ -52,7 +52,7 @@ class Explainer final : public ReplayObserver {
   // A block of several lines, apart from what is before it.
   void printBlock(const CallOutcome& outcome, const std::string& what);
   void printLine(const CallOutcome& outcome, const std::string& what);
-  Account& accountOf(const std::string& session, const RecordLayout* sensor);
+  Account& accountOf(const std::string& session, const Sensor* sensor);
   SessionIterator find(const std::string& name);
 
   std::FILE* out;

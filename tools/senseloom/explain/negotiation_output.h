@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "model/outcome.h"
-#include "replay/replayer.h"
+#include "trace/replayer.h"
 
 namespace senseloom::tool {
 

@@ -1,7 +1,9 @@
 #include "generate/commute_generator.h"
 
 #include <array>
-#include <cinttypes>
+#include <string_view>
+
+#include "trace/trace_form.h"
 
 namespace senseloom::tool {
 namespace {
@@ -105,15 +107,26 @@ int CommuteGenerator::observe(int activity) {
 
 void CommuteGenerator::writeRecord(int activity) {
   timestamp += 12000 + randomBelow(6000);
-  std::fprintf(out, R"({"call":"dispatch","sensor":"PHYAC","record":{"timestamp":%)" PRIu64 R"(,"items":[)", timestamp);
+  line.clear();
+  line.addText(member::kCall, callName(CallKind::dispatch));
+  line.addText(member::kSensor, "PHYAC");
+  line.beginObject(member::kRecord);
+  line.addInteger(member::kTimestamp, static_cast<int64_t>(timestamp));
+  line.beginArray(member::kItems);
   const uint32_t items = randomBelow(10) == 0 ? 2 + randomBelow(3) : 1;
   for (uint32_t i = 0; i < items; ++i) {
     // Sequence numbers are signed and wrap around at 12 bits.
     const int wrapped = static_cast<int>((sequence + 2048) % 4096) - 2048;
     ++sequence;
-    std::fprintf(out, R"(%s{"class":%d,"seq":%d})", i == 0 ? "" : ",", observe(activity), wrapped);
+    line.beginElement();
+    line.addInteger(member::kClass, observe(activity));
+    line.addInteger(member::kSequence, wrapped);
+    line.endObject();
   }
-  std::fputs("]}}\n", out);
+  line.endArray();
+  line.endObject();
+  const std::string_view text = line.finish();
+  std::fwrite(text.data(), 1, text.size(), out);
 }
 
 }  // namespace senseloom::tool

@@ -4,6 +4,8 @@
 #include <cstdint>
 #include <cstdio>
 
+#include "trace/trace_line.h"
+
 namespace senseloom::tool {
 
 // Writes the trace of a day's commute as an activity classifier gives it: mostly one decision a record, now and then
@@ -25,6 +27,7 @@ class CommuteGenerator {
   uint64_t randomState;
   uint32_t records;
 
+  TraceLine line;
   uint64_t timestamp = (6 * 60 + 50) * 60 * 1000;  // milliseconds since midnight: ten to seven
   uint32_t sequence = 0;
   // The class that the classifier takes the activity for, and for how many more decisions.

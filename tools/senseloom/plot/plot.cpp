@@ -60,7 +60,7 @@ void Plot::onOutcome(const CallOutcome& outcome) {
 }
 
 void Plot::dispatch(const CallOutcome& outcome, Group& group, PlotLane* client) {
-  const auto look = recordLookOf(*outcome.sensor).look;
+  const Sensor& sensor = *outcome.sensor;
   if (outcome.call.line != recordLine) {
     recordLine = outcome.call.line;
     timestamp = recordField<uint64_t>(outcome.record, kTimestampOffset).value_or(timestamp);
@@ -70,14 +70,14 @@ void Plot::dispatch(const CallOutcome& outcome, Group& group, PlotLane* client) 
         for (PlotLane& lane : each.clients) lane.fold();
       }
     }
-    group.records.receive(timeline.bin(), look(outcome.record, false));
+    group.records.receive(timeline.bin(), huesOf(sensor, outcome.record, false));
     ++group.records.offered;
   }
   if (client == nullptr) return;
   ++client->offered;
   if (!outcome.result) return;
   ++client->results;
-  client->receive(timeline.bin(), look(*outcome.result, true));
+  client->receive(timeline.bin(), huesOf(sensor, *outcome.result, true));
 }
 
 void Plot::setOption(const CallOutcome& outcome, PlotLane& client) {
@@ -87,7 +87,7 @@ void Plot::setOption(const CallOutcome& outcome, PlotLane& client) {
   client.addNote(now, (outcome.failed ? "refused: " : "") + optionText(outcome.call.option));
 }
 
-Plot::Group& Plot::groupOf(const RecordLayout& sensor) {
+Plot::Group& Plot::groupOf(const Sensor& sensor) {
   const auto known =
       std::find_if(groups.begin(), groups.end(), [&sensor](const Group& group) { return group.sensor == &sensor; });
   return known != groups.end() ? *known : groups.emplace_back(Group{.sensor = &sensor});

@@ -6,7 +6,7 @@
 
 #include "plot/plot_lane.h"
 #include "plot/timeline.h"
-#include "replay/replayer.h"
+#include "trace/replayer.h"
 
 namespace senseloom::tool {
 
@@ -15,7 +15,7 @@ namespace senseloom::tool {
 class Plot final : public ReplayObserver {
  public:
   struct Group {
-    const RecordLayout* sensor;
+    const Sensor* sensor;
     PlotLane records{""};
     std::vector<PlotLane> clients = {};
   };
@@ -30,7 +30,7 @@ class Plot final : public ReplayObserver {
  private:
   void dispatch(const CallOutcome& outcome, Group& group, PlotLane* client);
   void setOption(const CallOutcome& outcome, PlotLane& client);
-  Group& groupOf(const RecordLayout& sensor);
+  Group& groupOf(const Sensor& sensor);
   PlotLane* clientOf(Group& group, const std::string& session);
 
   Timeline timeline;

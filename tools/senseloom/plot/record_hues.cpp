@@ -2,7 +2,7 @@
 
 #include <algorithm>
 #include <cstdlib>
-#include <iterator>
+#include <optional>
 
 #include "trace/record_field.h"
 
@@ -20,52 +20,29 @@ RecordHues ofClass(int32_t classNumber) {
                                                                                  : kOtherHue);
 }
 
-// A record that is too short for its class shows none.
-template <class Number>
-RecordHues lookAtNumber(std::span<const uint8_t> record, bool) {
-  const auto number = recordField<Number>(record, kValueOffset);
-  return number ? ofClass(*number) : oneOf(kPlainHue);
+// The integer of the head; nothing when the record is too short for it.
+std::optional<int32_t> valueOf(const Sensor& sensor, std::span<const uint8_t> record) {
+  if (sensor.valueSize == sizeof(int32_t)) return recordField<int32_t>(record, kValueOffset);
+  return recordField<int16_t>(record, kValueOffset);
 }
 
-RecordHues lookAtItems(std::span<const uint8_t> record, bool) {
+RecordHues ofDecisions(std::span<const uint8_t> record) {
   RecordHues hues{.records = 1};
   const auto count = recordField<int16_t>(record, kValueOffset).value_or(0);
   for (int i = 0; i < count; ++i) {
-    const auto item = recordField<uint16_t>(record, kElementsOffset + 2 * static_cast<size_t>(i));
-    if (!item) break;
-    hues.add(ofClass(*item & 15));
+    const auto decision = recordField<uint16_t>(record, kItemsOffset + 2 * static_cast<size_t>(i));
+    if (!decision) break;
+    hues.add(ofClass(*decision & 15));
   }
   hues.records = 1;
   return hues;
 }
 
-// The record of a drawn gesture holds samples, its result the class.
-RecordHues lookAtGesture(std::span<const uint8_t> record, bool isResult) {
-  return isResult ? lookAtNumber<int16_t>(record, isResult) : oneOf(kPlainHue);
-}
-
-template <class Number>
-RecordHues lookAtHeight(std::span<const uint8_t> record, bool) {
+RecordHues ofAmount(int64_t amount) {
   RecordHues hues = oneOf(kPlainHue);
-  const int64_t number = recordField<Number>(record, kValueOffset).value_or(0);
-  hues.height = static_cast<uint32_t>(std::abs(number));
+  hues.height = static_cast<uint32_t>(std::abs(amount));
   return hues;
 }
-
-constexpr RecordLook kLooks[] = {
-    {.sensor = "PHYAC", .look = lookAtItems, .lasts = true},
-    {.sensor = "STAP", .look = lookAtNumber<int16_t>, .isClassSet = true},
-    {.sensor = "GSFLK", .look = lookAtNumber<int16_t>},
-    {.sensor = "SHAKI", .look = lookAtNumber<int16_t>},
-    {.sensor = "ISACT", .look = lookAtNumber<int32_t>, .lasts = true},
-    {.sensor = "SCOUN", .look = lookAtHeight<int32_t>, .hasHeight = true},
-    {.sensor = "GSPX", .look = lookAtGesture},
-    {.sensor = "DTWGS", .look = lookAtNumber<int16_t>, .isClassSet = true},
-    {.sensor = "GSETH", .look = lookAtNumber<int16_t>},
-    {.sensor = "LPE_P", .look = lookAtNumber<int16_t>, .lasts = true},
-    {.sensor = "PDR", .look = lookAtHeight<int16_t>, .hasHeight = true},
-    {.sensor = "LIFT", .look = lookAtNumber<int16_t>},
-};
 
 std::string classSetText(size_t set) {
   std::string text;
@@ -83,19 +60,23 @@ void RecordHues::add(const RecordHues& other) {
   records += other.records;
 }
 
-const RecordLook& recordLookOf(const RecordLayout& sensor) {
-  return *std::find_if(std::begin(kLooks), std::end(kLooks),
-                       [&sensor](const RecordLook& look) { return look.sensor == sensor.sensor; });
+RecordHues huesOf(const Sensor& sensor, std::span<const uint8_t> record, bool isResult) {
+  if (sensor.items == Items::decisions) return ofDecisions(record);
+  const auto value = valueOf(sensor, record);
+  if (sensor.shown == Shown::amount) return ofAmount(value.value_or(0));
+  // What a record has in the place of its result's class is not a class.
+  if (!value || (sensor.resultValue != nullptr && !isResult)) return oneOf(kPlainHue);
+  return ofClass(*value);
 }
 
-std::string hueText(const RecordLook& look, size_t hue, const std::vector<std::string>& names) {
-  if (hue == kPlainHue) return look.sensor == "SCOUN" ? "steps" : look.sensor == "PDR" ? "items" : "no class";
+std::string hueText(const Sensor& sensor, size_t hue, const std::vector<std::string>& names) {
+  if (hue == kPlainHue && sensor.shown == Shown::amount) return sensor.value == nullptr ? "items" : sensor.value;
+  if (hue == kPlainHue) return "no class";
   if (hue == kOtherHue) return "other class";
-  if (look.isClassSet) return classSetText(hue);
+  if (sensor.shown == Shown::classSet) return classSetText(hue);
   if (hue < names.size()) return names[hue];
-  // The one class that the library itself makes.
-  if (hue == 6 && look.sensor == "PHYAC") return "class 6 (no majority)";
-  return "class " + std::to_string(hue);
+  const std::string text = "class " + std::to_string(hue);
+  return static_cast<int32_t>(hue) == sensor.noMajorityClass ? text + " (no majority)" : text;
 }
 
 }  // namespace senseloom::tool

@@ -5,10 +5,9 @@
 #include <cstdint>
 #include <span>
 #include <string>
-#include <string_view>
 #include <vector>
 
-#include "trace/record_codec.h"
+#include "kinds/sensor_table.h"
 
 namespace senseloom::tool {
 
@@ -27,17 +26,10 @@ struct RecordHues {
   void add(const RecordHues& other);
 };
 
-// How the records of a sensor are shown.
-struct RecordLook {
-  std::string_view sensor;
-  RecordHues (*look)(std::span<const uint8_t> record, bool isResult);
-  bool lasts = false;      // a class holds until the next record tells another
-  bool hasHeight = false;  // a number is shown as height
-  bool isClassSet = false;
-};
-const RecordLook& recordLookOf(const RecordLayout& sensor);
+// What a picture shows of one record of a sensor, or of one result.
+RecordHues huesOf(const Sensor& sensor, std::span<const uint8_t> record, bool isResult);
 
 // What a hue stands for. `names` are those of the classes from 0 on, as far as they have names.
-std::string hueText(const RecordLook& look, size_t hue, const std::vector<std::string>& names);
+std::string hueText(const Sensor& sensor, size_t hue, const std::vector<std::string>& names);
 
 }  // namespace senseloom::tool

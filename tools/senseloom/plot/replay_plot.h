@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "plot/plot.h"
-#include "replay/replayer.h"
+#include "trace/replayer.h"
 
 namespace senseloom::tool {
 

@@ -30,7 +30,7 @@ std::string hueClass(size_t hue) {
 }
 
 std::string SvgLane::draw(const PlotLane& lane, uint32_t most) {
-  if (look.lasts) {
+  if (sensor.lasts) {
     drawLasting(lane);
   } else {
     drawEvents(lane, most);
@@ -84,7 +84,8 @@ void SvgLane::drawEvents(const PlotLane& lane, uint32_t most) {
     const double x = xOf(bin);
     const double width = std::clamp(xOf(bin + 1) - x - kGap, kNarrowestEvent, kWidestEvent);
     double share = 1;
-    if (look.hasHeight) share = most == 0 ? kLowestShare : std::max(kLowestShare, double{1} * content.height / most);
+    if (sensor.shown == Shown::amount)
+      share = most == 0 ? kLowestShare : std::max(kLowestShare, double{1} * content.height / most);
     const uint32_t total = std::accumulate(content.counts.begin(), content.counts.end(), uint32_t{0});
     double bottom = 0;
     for (size_t hue = 0; hue < kHues; ++hue) {

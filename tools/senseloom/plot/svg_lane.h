@@ -24,8 +24,8 @@ struct SvgBox {
 // a pile of their shares, the greatest at the bottom.
 class SvgLane {
  public:
-  SvgLane(const Timeline& timeline, const RecordLook& recordLook, const SvgBox& place)
-      : time(timeline), look(recordLook), box(place) {}
+  SvgLane(const Timeline& timeline, const Sensor& shownSensor, const SvgBox& place)
+      : time(timeline), sensor(shownSensor), box(place) {}
 
   // `most` is the greatest height, which fills the lane.
   std::string draw(const PlotLane& lane, uint32_t most);
@@ -43,7 +43,7 @@ class SvgLane {
   void addBar(size_t hue, double x, double width, double bottom, double height);
 
   const Timeline& time;
-  const RecordLook& look;
+  const Sensor& sensor;
   const SvgBox box;
   std::array<std::string, kHues> paths;
 };

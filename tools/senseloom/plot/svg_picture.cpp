@@ -6,7 +6,7 @@
 #include <string_view>
 #include <utility>
 
-#include "sensors/option_data.h"
+#include "kinds/option_data.h"
 #include "plot/svg_lane.h"
 #include "plot/svg_text.h"
 
@@ -95,11 +95,11 @@ class Picture {
   }
 
   void addGroup(const Plot::Group& group) {
-    const RecordLook& look = recordLookOf(*group.sensor);
+    const Sensor& sensor = *group.sensor;
     y += 22;
-    addText(kMargin, y, "name", group.sensor->sensor);
-    addText(kMargin + 60, y, "quiet", findOptionDescription(group.sensor->sensor)->title);
-    addLegend(group, look);
+    addText(kMargin, y, "name", group.sensor->name);
+    addText(kMargin + 60, y, "quiet", findOptionDescription(group.sensor->name)->title);
+    addLegend(group, sensor);
     y += 14;
     const double top = y;
     uint32_t most = 0;
@@ -108,15 +108,15 @@ class Picture {
       for (size_t bin = 0; bin < Timeline::kBins; ++bin) most = std::max(most, client.at(bin).received.height);
     }
     addNames("records", grouped(group.records.offered), y + kRecordsHeight / 2);
-    body += SvgLane(plot.time(), look, {kLeft, y, laneWidth(), kRecordsHeight}).draw(group.records, most);
+    body += SvgLane(plot.time(), sensor, {kLeft, y, laneWidth(), kRecordsHeight}).draw(group.records, most);
     y += kRecordsHeight + 4;
-    for (const PlotLane& client : group.clients) addClient(client, look, most);
+    for (const PlotLane& client : group.clients) addClient(client, sensor, most);
     addNegotiations(group.records, top, y);
     y -= kClientStride * static_cast<double>(group.clients.size());
     for (const PlotLane& client : group.clients) addAsks(client);
   }
 
-  void addLegend(const Plot::Group& group, const RecordLook& look) {
+  void addLegend(const Plot::Group& group, const Sensor& sensor) {
     RecordHues all;
     for (size_t bin = 0; bin < Timeline::kPlaces; ++bin) {
       all.add(group.records.at(bin).received);
@@ -126,7 +126,7 @@ class Picture {
     double x = left;
     for (size_t hue = 0; hue < kHues; ++hue) {
       if (all.counts[hue] == 0) continue;
-      const std::string text = hueText(look, hue, classNames);
+      const std::string text = hueText(sensor, hue, classNames);
       const double width = 16 + kCharacter * static_cast<double>(text.size()) + 16;
       if (x + width > kWidth - kRight + 16 && x > left) {
         x = left;
@@ -144,12 +144,12 @@ class Picture {
     addText(kMargin, middle + 12, "quiet small", detail);
   }
 
-  void addClient(const PlotLane& client, const RecordLook& look, uint32_t most) {
+  void addClient(const PlotLane& client, const Sensor& sensor, uint32_t most) {
     y += kNoteHeight;
     addNames(client.name, grouped(client.results) + " of " + grouped(client.offered), y + kClientHeight / 2);
     addPresence(client);
-    body += SvgLane(plot.time(), look, {kLeft, y, laneWidth(), kClientHeight}).draw(client, most);
-    if (look.lasts) addResultTicks(client);
+    body += SvgLane(plot.time(), sensor, {kLeft, y, laneWidth(), kClientHeight}).draw(client, most);
+    if (sensor.lasts) addResultTicks(client);
     y += kClientStride - kNoteHeight;
   }
 
@@ -269,7 +269,7 @@ class Picture {
       addPath("cut", 'M' + coordinate(x + 2) + ' ' + coordinate(y - 11) + "v14");
       explain("the sensor negotiates");
     }
-    if (std::any_of(groups.begin(), groups.end(), [](auto& group) { return recordLookOf(*group.sensor).lasts; })) {
+    if (std::any_of(groups.begin(), groups.end(), [](auto& group) { return group.sensor->lasts; })) {
       addPath("tick", 'M' + coordinate(x + 2) + ' ' + coordinate(y - 7) + "v5");
       explain("a result arrives");
     }

@@ -1,58 +1,35 @@
 #include "record/record_command.h"
 
-#include <dlfcn.h>
-#include <fcntl.h>
-#include <unistd.h>
+#include <CLI/CLI.hpp>
+#include <memory>
+#include <string>
+#include <vector>
 
-#include <cerrno>
-#include <cstdlib>
-#include <cstring>
-#include <filesystem>
-
-#include "input_error.h"
+#include "record/recorded_program.h"
 
 namespace senseloom::tool {
 namespace {
 
-[[noreturn]] void fail(const std::string& what) {
-  throw InputError(what + ": " + std::strerror(errno));
-}
-
-// It stands beside the library that the tool itself uses, wherever both are installed.
-std::string traceLibrary() {
-  Dl_info library{};
-  dladdr(dlsym(RTLD_NEXT, "ctx_open_session"), &library);
-  const auto folder = std::filesystem::canonical(library.dli_fname).parent_path();
-  const std::string file = folder / "libsenseloom-trace.so";
-  // The loader would say so, too, but go on without it.
-  if (access(file.c_str(), R_OK) != 0) fail(file);
-  return file;
-}
-
-// The program may change its folder before its first call. A file that can not be written is better known by now.
-std::string emptyFile(const std::string& file) {
-  const int descriptor = open(file.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_NONBLOCK, S_IRUSR | S_IWUSR);
-  if (descriptor < 0) fail(file);
-  close(descriptor);
-  return std::filesystem::absolute(file);
-}
+struct RecordArguments {
+  std::string file = "trace.jsonl";
+  std::vector<std::string> command;
+};
 
 }  // namespace
 
-void record(std::FILE* out, const std::string& file, std::vector<std::string> command) {
-  std::string preload = traceLibrary();
-  // What is there stays in front: a sanitizer has to be the first.
-  const char* others = std::getenv("LD_PRELOAD");
-  if (others != nullptr && *others != '\0') preload = others + (':' + preload);
-  if (setenv("SENSELOOM_TRACE", emptyFile(file).c_str(), 1) != 0 || setenv("LD_PRELOAD", preload.c_str(), 1) != 0 ||
-      dup2(fileno(out), STDOUT_FILENO) < 0) {
-    fail(command.front());
-  }
-  std::vector<char*> arguments;
-  for (std::string& argument : command) arguments.push_back(argument.data());
-  arguments.push_back(nullptr);
-  execvp(arguments.front(), arguments.data());
-  fail(command.front());
+void declareRecord(CLI::App& app, Action& action) {
+  CLI::App* command =
+      app.add_subcommand("record", "Start a program with its calls of the library recorded in a trace.");
+  command->footer(
+      "What follows -- belongs to the program: senseloom record -o FILE -- PROGRAM ARGUMENT...\n"
+      "Exit status: that of the program; 2 when it cannot be started.");
+  auto arguments = std::make_shared<RecordArguments>();
+  command->add_option("-o,--output", arguments->file, "the trace; an existing file is overwritten")
+      ->capture_default_str();
+  command->add_option("COMMAND", arguments->command, "the program and its arguments")->required();
+  command->callback([arguments, &action] {
+    action = [arguments](std::FILE* out) { startRecorded(out, arguments->file, arguments->command); };
+  });
 }
 
 }  // namespace senseloom::tool

@@ -2,42 +2,30 @@
 
 #include <stdexcept>
 #include <string>
-#include <utility>
+#include <string_view>
 
-#include "trace/hex.h"
 #include "trace/json.h"
-#include "replay/json_output.h"
+#include "trace/trace_line.h"
 
 namespace senseloom::tool {
 namespace {
 
-Json hexText(std::span<const uint8_t> bytes) {
-  return Json(json_string(toHex(bytes).c_str()));
-}
-
-Json propertyArray(const PropertyList& properties) {
-  Json array(json_array());
-  for (const Property& property : properties) {
-    Json entry(json_object());
-    addMember(entry, "id", Json(json_integer(property.id)));
-    addMember(entry, "size", Json(json_integer(static_cast<json_int_t>(property.value.size()))));
-    addMember(entry, "value", hexText(property.value));
-    json_array_append_new(array.get(), entry.release());
-  }
-  return array;
-}
-
-// What came of a call, in the form of a recording.
+// The outcome of a call, as a recording tells it.
 Json recordingOf(const CallOutcome& outcome) {
-  Json object(json_object());
-  addMember(object, "returned", returnedJson(outcome));
-  if (outcome.properties) addMember(object, "properties", propertyArray(*outcome.properties));
-  if (outcome.result) {
-    Json record(json_object());
-    addMember(record, "hex", hexText(*outcome.result));
-    addMember(object, "result", std::move(record));
+  TraceLine line;
+  if (outcome.call.kind == CallKind::open) {
+    line.addOpened(!outcome.failed);
+  } else {
+    line.addReturned(outcome.returned);
   }
-  return object;
+  if (outcome.properties) {
+    line.beginArray(member::kProperties);
+    for (const Property& property : *outcome.properties) line.addProperty(property.id, property.value);
+    line.endArray();
+  }
+  if (outcome.result) line.addBytes(member::kResult, *outcome.result);
+  const std::string_view text = line.finish();
+  return Json(json_loadb(text.data(), text.size(), 0, nullptr));
 }
 
 }  // namespace

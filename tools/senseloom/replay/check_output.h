@@ -3,7 +3,7 @@
 #include <cstddef>
 #include <cstdio>
 
-#include "replay/replayer.h"
+#include "trace/replayer.h"
 #include "trace/trace_reader.h"
 
 namespace senseloom::tool {

@@ -2,8 +2,10 @@
 
 #include <utility>
 
+#include "kinds/option_data.h"
 #include "trace/hex.h"
-#include "sensors/option_data.h"
+#include "trace/json.h"
+#include "trace/record_codec.h"
 
 namespace senseloom::tool {
 namespace {
@@ -17,44 +19,45 @@ Json properties(const CallOutcome& outcome) {
   Json list(json_array());
   for (const Property& property : *outcome.properties) {
     Json entry(json_object());
-    addMember(entry, "id", Json(json_integer(property.id)));
-    addMember(entry, "name", text(propertyName(outcome.sensor->sensor, property.id)));
+    addMember(entry, member::kId, Json(json_integer(property.id)));
+    addMember(entry, "name", text(propertyName(outcome.sensor->name, property.id)));
     if (const auto value = property.integer()) {
-      addMember(entry, "value", Json(json_integer(*value)));
+      addMember(entry, member::kValue, Json(json_integer(*value)));
     } else {
-      addMember(entry, "hex", text(toHex(property.value)));
+      addMember(entry, member::kHex, text(toHex(property.value)));
     }
     json_array_append_new(list.get(), entry.release());
   }
   return list;
 }
 
-}  // namespace
-
-Json returnedJson(const CallOutcome& outcome) {
+// What the library returned: a number; for an open whether it gave a handle.
+Json returned(const CallOutcome& outcome) {
   if (outcome.call.kind != CallKind::open) return Json(json_integer(outcome.returned));
-  return outcome.failed ? Json(json_null()) : text("handle");
+  return outcome.failed ? Json(json_null()) : text(kHandle);
 }
+
+}  // namespace
 
 void JsonOutput::onOutcome(const CallOutcome& outcome) {
   const CallKind kind = outcome.call.kind;
   Json object(json_object());
   addMember(object, "line",
             Json(outcome.call.line == 0 ? json_null() : json_integer(static_cast<json_int_t>(outcome.call.line))));
-  addMember(object, "call", text(callName(kind)));
+  addMember(object, member::kCall, text(callName(kind)));
   if (kind != CallKind::uninit) {
-    addMember(object, "session", text(outcome.session));
-    addMember(object, "sensor", text(outcome.sensor->sensor));
-    addMember(object, "return", returnedJson(outcome));
+    addMember(object, member::kSession, text(outcome.session));
+    addMember(object, member::kSensor, text(outcome.sensor->name));
+    addMember(object, "return", returned(outcome));
   }
   if (kind == CallKind::setOption || kind == CallKind::close) {
-    addMember(object, "properties", properties(outcome));
+    addMember(object, member::kProperties, properties(outcome));
   }
   if (kind == CallKind::dispatch) {
     Json fields;
     if (outcome.result) fields = decodeResult(*outcome.sensor, *outcome.result);
-    addMember(object, "result", fields != nullptr ? std::move(fields) : Json(json_null()));
-    addMember(object, "hex", outcome.result ? text(toHex(*outcome.result)) : Json(json_null()));
+    addMember(object, member::kResult, fields != nullptr ? std::move(fields) : Json(json_null()));
+    addMember(object, member::kHex, outcome.result ? text(toHex(*outcome.result)) : Json(json_null()));
   }
   std::fprintf(out, "%s\n", compactText(object.get()).c_str());
 }

@@ -2,20 +2,16 @@
 
 #include <cstdio>
 
-#include "trace/json.h"
-#include "replay/replayer.h"
+#include "trace/replayer.h"
 
 namespace senseloom::tool {
 
-// What the library returned: a number; for an open "handle" or null.
-Json returnedJson(const CallOutcome& outcome);
-
-// Prints one JSON object a call and session. What it holds depends on the call alone, not on what came of it:
+// Prints one JSON object per call and session. What it holds depends on the call alone, not on what came of it:
 //
 //   "line"        line of the trace; null: the closing of a session that the trace left open
 //   "call"        as in the trace
-//   "session"     name, and
-//   "sensor"      ... (not for uninit)
+//   "session"     its name (not for uninit)
+//   "sensor"      its sensor's name (not for uninit)
 //   "return"      what the library returned; for an open "handle" or null (not for uninit)
 //   "properties"  for set_option and close: an array of {"id","name","value"}, with "hex" in place of "value" for the
 //                 bytes of a gesture template; null when the library handed out no list

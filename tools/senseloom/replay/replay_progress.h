@@ -6,7 +6,7 @@
 #include <utility>
 
 #include "terminal/progress_bar.h"
-#include "replay/replayer.h"
+#include "trace/replayer.h"
 #include "trace/trace_reader.h"
 
 namespace senseloom::tool {

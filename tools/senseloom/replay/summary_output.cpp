@@ -20,7 +20,7 @@ void SummaryOutput::onEnd() {
   for (const Client& client : clients) width = std::max(width, static_cast<int>(client.session.size()));
   std::fprintf(out, "%-*s  sensor    opened   records   results    failed\n", width, "session");
   for (const Client& client : clients) {
-    std::fprintf(out, "%-*s  %-6s  %8zu  %8zu  %8zu  %8zu\n", width, client.session.c_str(), client.sensor->sensor,
+    std::fprintf(out, "%-*s  %-6s  %8zu  %8zu  %8zu  %8zu\n", width, client.session.c_str(), client.sensor->name,
                  client.opened, client.records, client.results, client.failed);
   }
 }

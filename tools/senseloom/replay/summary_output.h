@@ -5,7 +5,7 @@
 #include <string>
 #include <vector>
 
-#include "replay/replayer.h"
+#include "trace/replayer.h"
 
 namespace senseloom::tool {
 
@@ -21,7 +21,7 @@ class SummaryOutput final : public ReplayObserver {
  private:
   struct Client {
     std::string session;
-    const RecordLayout* sensor;
+    const Sensor* sensor;
     size_t opened = 0;
     size_t records = 0;
     size_t results = 0;

@@ -3,9 +3,10 @@
 #include <algorithm>
 #include <span>
 
+#include "kinds/option_data.h"
 #include "trace/hex.h"
 #include "trace/json.h"
-#include "sensors/option_data.h"
+#include "trace/record_codec.h"
 
 namespace senseloom::tool {
 namespace {
@@ -28,7 +29,7 @@ std::string propertiesText(const CallOutcome& outcome) {
   std::string text;
   for (const Property& property : *outcome.properties) {
     if (!text.empty()) text += ", ";
-    text += std::to_string(property.id) + ' ' + propertyName(outcome.sensor->sensor, property.id) + '=';
+    text += std::to_string(property.id) + ' ' + propertyName(outcome.sensor->name, property.id) + '=';
     const auto value = property.integer();
     text += value ? std::to_string(*value) : bytesText(property.value);
   }
@@ -65,7 +66,7 @@ std::string resultText(const CallOutcome& outcome) {
 std::string returnText(const CallOutcome& outcome) {
   switch (outcome.call.kind) {
     case CallKind::open:
-      return outcome.failed ? "NULL" : "handle";
+      return outcome.failed ? "NULL" : kHandle;
     case CallKind::uninit:
       return "";
     default:
@@ -93,7 +94,7 @@ void TableOutput::onOutcome(const CallOutcome& outcome) {
   if (!all && outcome.call.kind == CallKind::dispatch && outcome.returned == 0) return;
   sessionWidth = std::max(sessionWidth, outcome.session.size());
   printRow(outcome.call.line == 0 ? "end" : std::to_string(outcome.call.line), callName(outcome.call.kind),
-           outcome.session, outcome.sensor == nullptr ? "" : outcome.sensor->sensor, returnText(outcome),
+           outcome.session, outcome.sensor == nullptr ? "" : outcome.sensor->name, returnText(outcome),
            outcomeText(outcome));
 }
 

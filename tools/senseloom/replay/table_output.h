@@ -5,7 +5,7 @@
 #include <string>
 #include <string_view>
 
-#include "replay/replayer.h"
+#include "trace/replayer.h"
 
 namespace senseloom::tool {
 

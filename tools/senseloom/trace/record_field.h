@@ -10,8 +10,8 @@
 namespace senseloom::tool {
 
 inline constexpr size_t kTimestampOffset = 0;
-inline constexpr size_t kValueOffset = 8;      // the class, the classes, the steps, or the number of items
-inline constexpr size_t kElementsOffset = 10;  // of records with a number of items
+inline constexpr size_t kValueOffset = 8;   // the class, the classes, the steps, or the number of items
+inline constexpr size_t kItemsOffset = 10;  // of a record that counts its items
 
 // Nothing when the record ends before the field does.
 template <class Integer>
@@ -20,6 +20,12 @@ std::optional<Integer> recordField(std::span<const uint8_t> record, size_t offse
   Integer value;
   std::memcpy(&value, record.data() + offset, sizeof value);
   return value;
+}
+
+// The record has room for the field.
+template <class Integer>
+void setRecordField(std::span<uint8_t> record, size_t offset, Integer value) {
+  std::memcpy(record.data() + offset, &value, sizeof value);
 }
 
 }  // namespace senseloom::tool

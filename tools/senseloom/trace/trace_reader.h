@@ -8,31 +8,15 @@
 #include <string>
 
 #include "trace/json.h"
-#include "trace/record_codec.h"
+#include "trace/trace_call.h"
 
 namespace senseloom::tool {
 
-enum class CallKind { open, setOption, dispatch, close, uninit };
-
-// The name of a call in traces and in output.
-const char* callName(CallKind kind);
-
-// One call of a trace.
-struct TraceCall {
-  size_t line = 0;
-  CallKind kind = CallKind::uninit;
-  std::string session;                   // empty for uninit, and for a dispatch to a whole sensor
-  const RecordLayout* sensor = nullptr;  // of an open, and of a dispatch to a whole sensor
-  std::optional<std::string> option;     // of a set_option; nothing: a null pointer
-  Json record;                           // of a dispatch
-  Json recorded;                         // what a recording says it came to; null: nothing
-};
-
-// Reads a trace, JSON Lines with one call a line, a line at a time. Blank lines and lines with a "note" in place of a
-// call are skipped; members of a line beyond those of its call are ignored, which leaves room for notes there, too.
+// Reads a trace, JSON Lines with one call a line, a line at a time. Blank lines are skipped, and so are lines with a
+// "note" in place of a call.
 class TraceReader {
  public:
-  // "-" is standard input. Throws InputError when the file can not be opened.
+  // "-" is standard input. Throws InputError when the file cannot be opened.
   explicit TraceReader(const std::string& file);
 
   // The next call, or nothing at the end. Throws InputError when there is none on a line that is not blank.

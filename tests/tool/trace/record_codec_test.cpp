@@ -4,12 +4,10 @@
 
 #include <iterator>
 #include <ostream>
-#include <set>
 #include <string>
 
-#include "trace/hex.h"
 #include "input_error.h"
-#include "sensors/option_data.h"
+#include "trace/hex.h"
 
 namespace senseloom::tool {
 namespace {
@@ -18,16 +16,12 @@ Json parsed(const std::string& text) {
   return Json(json_loads(text.c_str(), 0, nullptr));
 }
 
-const RecordLayout& layoutOf(const std::string& sensor) {
-  return *findRecordLayout(sensor);
-}
-
 std::string encoded(const std::string& sensor, const std::string& record) {
-  return toHex(encodeRecord(layoutOf(sensor), parsed(record).get()));
+  return toHex(encodeRecord(sensorNamed(sensor), parsed(record).get()));
 }
 
 std::string decoded(const std::string& sensor, const std::string& hex) {
-  const Json fields = decodeResult(layoutOf(sensor), *fromHex(hex));
+  const Json fields = decodeResult(sensorNamed(sensor), *fromHex(hex));
   return fields == nullptr ? "nothing" : compactText(fields.get());
 }
 
@@ -37,17 +31,6 @@ std::string errorOf(const std::string& sensor, const std::string& record) {
   } catch (const InputError& error) {
     return error.what();
   }
-}
-
-TEST(RecordCodec, HasOneLayoutForEachSensorThatHasOptions) {
-  std::set<std::string> withLayout;
-  for (const RecordLayout& layout : recordLayouts()) withLayout.insert(layout.sensor);
-  std::set<std::string> withOptions;
-  for (const OptionDescription* kind : optionDescriptions()) withOptions.insert(kind->sensor);
-  EXPECT_EQ(withLayout, withOptions);
-  EXPECT_EQ(recordLayouts().size(), 12U);
-  EXPECT_EQ(findRecordLayout("phyac"), nullptr);
-  EXPECT_EQ(findRecordLayout(""), nullptr);
 }
 
 // A record by fields, its bytes, and the fields of a result of the same bytes.

@@ -7,7 +7,6 @@
 #include <string>
 #include <vector>
 
-#include "trace/record_codec.h"
 #include "senseloom.hpp"
 #include "trace/trace_reader.h"
 
@@ -17,8 +16,9 @@ namespace senseloom::tool {
 struct Property {
   int32_t id;
   std::vector<uint8_t> value;
+  bool isBytes = false;  // such as a gesture template; all other properties are integers
 
-  // Nothing for the bytes of a gesture template, the one property that is no integer.
+  // Nothing if it is not an integer.
   std::optional<int32_t> integer() const;
 };
 using PropertyList = std::vector<Property>;
@@ -27,7 +27,7 @@ using PropertyList = std::vector<Property>;
 struct CallOutcome {
   const TraceCall& call;                                  // line 0: the closing of a session that the trace left open
   const std::string& session;                             // empty for uninit
-  const RecordLayout* sensor = nullptr;                   // null for uninit
+  const Sensor* sensor = nullptr;                         // null for uninit
   bool failed = false;                                    // the library returned -1 or, for an open, a null pointer
   int returned = 0;                                       // 0 for open and uninit, which return no int
   std::optional<PropertyList> properties = std::nullopt;  // the list that the library handed out, if it did
@@ -56,7 +56,7 @@ class Replayer {
   Replayer& operator=(const Replayer&) = delete;
 
   // Makes all calls of a trace, then closes the sessions that it left open, in opening order. Throws InputError, with
-  // the position in the trace, at the first line that is no call or does not suit the calls before it.
+  // the position in the trace, at the first line that is not a call or does not suit the calls before it.
   void replay(TraceReader& trace);
 
   // Makes one call. Throws InputError when it does not suit the calls before it.
@@ -65,7 +65,7 @@ class Replayer {
  private:
   struct Client {
     std::string name;
-    const RecordLayout* sensor;
+    const Sensor* sensor;
     Session session;
   };
   using ClientIterator = std::vector<Client>::iterator;

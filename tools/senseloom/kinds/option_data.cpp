@@ -1,4 +1,4 @@
-#include "sensors/option_data.h"
+#include "kinds/option_data.h"
 
 #include <algorithm>
 #include <iterator>

@@ -30,7 +30,7 @@ TEST(ReplayErrors, NamesAFileThatDoesNotExist) {
 
 TEST(ReplayErrors, NamesAFileThatCanNotBeRead) {
   const ToolRun run = runTool({"replay", "../examples"});
-  EXPECT_EQ(run.err, "senseloom: ../examples: can not be read: Is a directory\n");
+  EXPECT_EQ(run.err, "senseloom: ../examples: cannot be read: Is a directory\n");
   EXPECT_EQ(run.status, 2);
 }
 

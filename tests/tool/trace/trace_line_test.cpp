@@ -1,4 +1,4 @@
-#include "trace_line.h"
+#include "trace/trace_line.h"
 
 #include <gtest/gtest.h>
 
@@ -6,9 +6,7 @@
 #include <cstdint>
 #include <string_view>
 
-#include "senseloom.h"
-
-namespace senseloom::trace {
+namespace senseloom::tool {
 namespace {
 
 TEST(TraceLine, JoinsMembersInTheirOrder) {
@@ -45,25 +43,49 @@ TEST(TraceLine, HasTheBytesOfATextBeyondAscii) {
 }
 
 TEST(TraceLine, HasTheValuesOfPropertiesAsBytes) {
-  int32_t value = -2;
-  std::array<uint8_t, 3> bytes{1, 2, 0xfe};
-  // Room for a list of two.
-  alignas(ctx_option_t) std::array<uint8_t, sizeof(ctx_option_t) + 2 * sizeof(ctx_property_t)> storage{};
-  auto* list = new (storage.data()) ctx_option_t;
   TraceLine line;
-  list->count = 0;
-  line.addProperties("properties", *list);
+  line.beginArray("properties");
+  line.endArray();
   EXPECT_EQ(line.finish(), "{\"properties\":[]}\n");
 
-  list->count = 2;
-  list->properties[0] = {122, sizeof value, &value};
-  list->properties[1] = {123, sizeof bytes, bytes.data()};
   line.clear();
-  line.addProperties("properties", *list);
+  line.beginArray("properties");
+  line.addProperty(122, std::array<uint8_t, 4>{0xfe, 0xff, 0xff, 0xff});
+  line.addProperty(123, std::array<uint8_t, 3>{1, 2, 0xfe});
+  line.endArray();
   EXPECT_EQ(line.finish(),
             R"({"properties":[{"id":122,"size":4,"value":"feffffff"},{"id":123,"size":3,"value":"0102fe"}]})"
             "\n");
 }
 
+TEST(TraceLine, NestsObjectsInArraysInObjects) {
+  TraceLine line;
+  line.beginObject("record");
+  line.beginArray("items");
+  for (const int value : {1, 2}) {
+    line.beginElement();
+    line.addInteger("class", value);
+    line.endObject();
+  }
+  line.endArray();
+  line.addInteger("timestamp", 3);
+  line.endObject();
+  line.addNull("after");
+  EXPECT_EQ(line.finish(), R"({"record":{"items":[{"class":1},{"class":2}],"timestamp":3},"after":null})"
+                           "\n");
+}
+
+TEST(TraceLine, SaysWhatACallReturned) {
+  TraceLine line;
+  line.addOpened(true);
+  EXPECT_EQ(line.finish(), "{\"returned\":\"handle\"}\n");
+  line.clear();
+  line.addOpened(false);
+  EXPECT_EQ(line.finish(), "{\"returned\":null}\n");
+  line.clear();
+  line.addReturned(-1);
+  EXPECT_EQ(line.finish(), "{\"returned\":-1}\n");
+}
+
 }  // namespace
-}  // namespace senseloom::trace
+}  // namespace senseloom::tool

@@ -1,22 +1,23 @@
-#include "replay/replayer.h"
+#include "trace/replayer.h"
 
 #include <algorithm>
-#include <cstring>
 #include <utility>
 
 #include "input_error.h"
+#include "trace/record_codec.h"
+#include "trace/record_field.h"
 
 namespace senseloom::tool {
 namespace {
 
-constexpr int32_t kTemplateBytes = 123;
-
 // Copies a property list at once, since the next call makes its values stale.
-std::optional<PropertyList> copyOf(const senseloom::PropertyList& list) {
+std::optional<PropertyList> copyOf(const senseloom::PropertyList& list, const Sensor& sensor) {
   if (!list) return std::nullopt;
   PropertyList properties;
   for (const auto property : list) {
-    properties.push_back({property.id(), {property.bytes().begin(), property.bytes().end()}});
+    properties.push_back({.id = property.id(),
+                          .value = {property.bytes().begin(), property.bytes().end()},
+                          .isBytes = property.id() == sensor.bytesProperty});
   }
   return properties;
 }
@@ -48,10 +49,8 @@ int returnedBy(CloseOutcome outcome) {
 }  // namespace
 
 std::optional<int32_t> Property::integer() const {
-  int32_t number;
-  if (id == kTemplateBytes || value.size() != sizeof number) return std::nullopt;
-  std::memcpy(&number, value.data(), sizeof number);
-  return number;
+  if (isBytes || value.size() != sizeof(int32_t)) return std::nullopt;
+  return recordField<int32_t>(value, 0);
 }
 
 void Replayer::replay(TraceReader& trace) {
@@ -100,7 +99,7 @@ void Replayer::open(const TraceCall& call) {
     if (known->session) throw InputError("session \"" + call.session + "\" is already open");
     clients.erase(known);
   }
-  clients.push_back({call.session, call.sensor, Session::open(call.sensor->sensor)});
+  clients.push_back({call.session, call.sensor, Session::open(call.sensor->name)});
   observer.onOutcome({.call = call, .session = call.session, .sensor = call.sensor, .failed = !clients.back().session});
 }
 
@@ -111,7 +110,7 @@ void Replayer::setOption(const TraceCall& call, Client& client) {
                       .sensor = client.sensor,
                       .failed = !result.accepted,
                       .returned = result.accepted ? 0 : -1,
-                      .properties = copyOf(result.properties)});
+                      .properties = copyOf(result.properties, *client.sensor)});
 }
 
 void Replayer::dispatch(const TraceCall& call, Client& client, std::span<const uint8_t> record) {
@@ -143,7 +142,7 @@ void Replayer::close(const TraceCall& call, ClientIterator client) {
                       .sensor = closing.sensor,
                       .failed = result.outcome == CloseOutcome::failed,
                       .returned = returnedBy(result.outcome),
-                      .properties = copyOf(result.properties)});
+                      .properties = copyOf(result.properties, *closing.sensor)});
 }
 
 Replayer::ClientIterator Replayer::find(const std::string& name) {

@@ -1,15 +1,16 @@
-#include "trace_line.h"
+#include "trace/trace_line.h"
 
 #include <algorithm>
 #include <cstdio>
 
 #include "trace/hex.h"
+#include "trace/trace_form.h"
 
-namespace senseloom::trace {
+namespace senseloom::tool {
 namespace {
 
-std::span<const uint8_t> bytesOf(const void* data, size_t size) {
-  return {static_cast<const uint8_t*>(data), size};
+bool isBeyondAscii(char c) {
+  return static_cast<uint8_t>(c) >= 0x80;
 }
 
 // What stands in a JSON string for an ASCII text.
@@ -31,9 +32,9 @@ std::string escaped(std::string_view text) {
 }  // namespace
 
 void TraceLine::addText(std::string_view key, std::string_view text) {
-  if (std::any_of(text.begin(), text.end(), [](char c) { return static_cast<uint8_t>(c) >= 0x80; })) {
+  if (std::any_of(text.begin(), text.end(), isBeyondAscii)) {
     addKey(std::string(key) + "Hex");
-    addQuoted(tool::toHex(bytesOf(text.data(), text.size())));
+    addQuoted(toHex({reinterpret_cast<const uint8_t*>(text.data()), text.size()}));
   } else {
     addKey(key);
     addQuoted(escaped(text));
@@ -51,23 +52,46 @@ void TraceLine::addNull(std::string_view key) {
 }
 
 void TraceLine::addBytes(std::string_view key, std::span<const uint8_t> bytes) {
-  addKey(key);
-  buffer += "{\"hex\":";
-  addQuoted(tool::toHex(bytes));
-  buffer += '}';
+  beginObject(key);
+  addKey(member::kHex);
+  addQuoted(toHex(bytes));
+  endObject();
 }
 
-void TraceLine::addProperties(std::string_view key, const ctx_option_t& list) {
+void TraceLine::beginArray(std::string_view key) {
   addKey(key);
   buffer += '[';
-  for (int32_t i = 0; i < list.count; ++i) {
-    const ctx_property_t& property = list.properties[i];
-    if (i > 0) buffer += ',';
-    buffer += "{\"id\":" + std::to_string(property.id) + ",\"size\":" + std::to_string(property.size) + ",\"value\":";
-    addQuoted(tool::toHex(bytesOf(property.value, static_cast<size_t>(property.size))));
-    buffer += '}';
+}
+
+void TraceLine::beginObject(std::string_view key) {
+  addKey(key);
+  buffer += '{';
+}
+
+void TraceLine::beginElement() {
+  separate();
+  buffer += '{';
+}
+
+void TraceLine::addReturned(int value) {
+  addInteger(member::kReturned, value);
+}
+
+void TraceLine::addOpened(bool hasHandle) {
+  if (hasHandle) {
+    addText(member::kReturned, kHandle);
+  } else {
+    addNull(member::kReturned);
   }
-  buffer += ']';
+}
+
+void TraceLine::addProperty(int32_t id, std::span<const uint8_t> value) {
+  beginElement();
+  addInteger(member::kId, id);
+  addInteger(member::kSize, static_cast<int64_t>(value.size()));
+  addKey(member::kValue);
+  addQuoted(toHex(value));
+  endObject();
 }
 
 std::string_view TraceLine::finish() {
@@ -75,8 +99,13 @@ std::string_view TraceLine::finish() {
   return buffer;
 }
 
+void TraceLine::separate() {
+  if (const char last = buffer.back(); last != '{' && last != '[') buffer += ',';
+}
+
 void TraceLine::addKey(std::string_view key) {
-  buffer += buffer.empty() ? '{' : ',';
+  if (buffer.empty()) buffer += '{';
+  separate();
   addQuoted(key);
   buffer += ':';
 }
@@ -87,4 +116,4 @@ void TraceLine::addQuoted(std::string_view text) {
   buffer += '"';
 }
 
-}  // namespace senseloom::trace
+}  // namespace senseloom::tool

@@ -51,7 +51,7 @@ TEST_F(TraceReading, GivesTheCallsInOrderWithTheirLines) {
   EXPECT_EQ(call->line, 1U);
   EXPECT_EQ(call->kind, CallKind::open);
   EXPECT_EQ(call->session, "nav");
-  EXPECT_EQ(call->sensor, findRecordLayout("PHYAC"));
+  EXPECT_EQ(call->sensor, findSensor("PHYAC"));
 
   call = reader.next();
   ASSERT_TRUE(call);
@@ -71,7 +71,7 @@ TEST_F(TraceReading, GivesTheCallsInOrderWithTheirLines) {
   ASSERT_TRUE(call);
   EXPECT_EQ(call->kind, CallKind::dispatch);
   EXPECT_EQ(call->session, "");
-  EXPECT_EQ(call->sensor, findRecordLayout("STAP"));
+  EXPECT_EQ(call->sensor, findSensor("STAP"));
 
   call = reader.next();
   ASSERT_TRUE(call);

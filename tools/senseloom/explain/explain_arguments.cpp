@@ -1,0 +1,48 @@
+#include "explain/explain_arguments.h"
+
+#include <CLI/CLI.hpp>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "explain/explain_command.h"
+#include "kinds/sensor_table.h"
+#include "plot/plot_options.h"
+
+namespace senseloom::tool {
+namespace {
+
+struct ExplainArguments {
+  std::string subject;
+  std::vector<std::string> options;
+  bool records = false;
+  PlotArguments plot;
+};
+
+void explain(std::FILE* out, const ExplainArguments& arguments) {
+  if (findSensor(arguments.subject) != nullptr || !arguments.options.empty()) {
+    explainOptions(out, arguments.subject, arguments.options);
+  } else {
+    explainTrace(out, arguments.subject, arguments.records, arguments.plot);
+  }
+}
+
+}  // namespace
+
+void declareExplain(CLI::App& app, Action& action) {
+  CLI::App* command = app.add_subcommand(
+      "explain", "Explain whose request won in each negotiation, what was rejected, and why records did not arrive.");
+  command->footer(
+      "With a sensor: opens a session for each option string, one after the other, and explains what they negotiate.\n"
+      "The reasons are computed independently of the library; where the two disagree, the line says \"unexplained\".\n"
+      "Exit status: 0; 1 when the output cannot be written; 2 for bad input, such as an option that is not JSON.");
+  auto arguments = std::make_shared<ExplainArguments>();
+  command->add_option("TRACE", arguments->subject, "a trace (- is standard input), or the name of a sensor")
+      ->required();
+  auto* options = command->add_option("OPTION", arguments->options, "the option string of a session on the sensor");
+  command->add_flag("--records", arguments->records, "explain what became of each record, too")->excludes(options);
+  addPlotOptions(*command, arguments->plot)->excludes(options);
+  command->callback([arguments, &action] { action = [arguments](std::FILE* out) { explain(out, *arguments); }; });
+}
+
+}  // namespace senseloom::tool

@@ -1,0 +1,16 @@
+#include "plot/plot_options.h"
+
+#include <CLI/CLI.hpp>
+
+namespace senseloom::tool {
+
+CLI::Option* addPlotOptions(CLI::App& command, PlotArguments& plot) {
+  auto* file = command.add_option("--plot", plot.file, "write a picture of it to this file, as SVG");
+  command
+      .add_option("--class-names", plot.classNames, "names for the classes in the picture, from class 0 on: A,B,...")
+      ->delimiter(',')
+      ->needs(file);
+  return file;
+}
+
+}  // namespace senseloom::tool

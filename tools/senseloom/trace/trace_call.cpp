@@ -1,0 +1,122 @@
+#include "trace/trace_call.h"
+
+#include <algorithm>
+#include <string_view>
+
+#include "input_error.h"
+#include "trace/hex.h"
+
+namespace senseloom::tool {
+namespace {
+
+std::string quoted(std::string_view name) {
+  return '"' + std::string(name) + '"';
+}
+
+json_t* requireMember(const Json& object, const char* key) {
+  json_t* value = json_object_get(object.get(), key);
+  if (value == nullptr) throw InputError("missing " + quoted(key));
+  return value;
+}
+
+std::string stringMember(const Json& object, const char* key) {
+  const json_t* value = requireMember(object, key);
+  if (!json_is_string(value)) throw InputError(quoted(key) + " must be a string");
+  return json_string_value(value);
+}
+
+CallKind callMember(const Json& object) {
+  const std::string name = stringMember(object, member::kCall);
+  const auto* call =
+      std::find_if(kAllCalls.begin(), kAllCalls.end(), [&name](CallKind kind) { return name == callName(kind); });
+  if (call == kAllCalls.end()) {
+    throw InputError("unknown call \"" + name + "\": open, set_option, dispatch, close and uninit are known");
+  }
+  return *call;
+}
+
+std::string sessionMember(const Json& object) {
+  std::string name = stringMember(object, member::kSession);
+  if (name.empty()) throw InputError(quoted(member::kSession) + " must not be empty");
+  return name;
+}
+
+const Sensor* sensorMember(const Json& object) {
+  return &sensorNamed(stringMember(object, member::kSensor));
+}
+
+// An option given as a string reaches the library as it stands, whether it is JSON or not; one that no string can hold
+// is given as bytes.
+std::optional<std::string> optionMember(const Json& object) {
+  if (json_object_get(object.get(), member::kOptionHex) != nullptr) {
+    const auto bytes = fromHex(stringMember(object, member::kOptionHex));
+    if (!bytes) throw InputError(quoted(member::kOptionHex) + " must hold hexadecimal digits, two a byte");
+    return std::string(bytes->begin(), bytes->end());
+  }
+  const json_t* option = requireMember(object, member::kOption);
+  if (json_is_null(option)) return std::nullopt;
+  if (json_is_string(option)) return json_string_value(option);
+  if (json_is_object(option)) return compactText(option);
+  throw InputError(quoted(member::kOption) + " must be an object, a string or null");
+}
+
+Json recordMember(const Json& object) {
+  json_t* record = requireMember(object, member::kRecord);
+  if (!json_is_object(record)) throw InputError(quoted(member::kRecord) + " must be an object");
+  return Json(json_incref(record));
+}
+
+void readTarget(const Json& object, TraceCall& call) {
+  const bool hasSession = json_object_get(object.get(), member::kSession) != nullptr;
+  const bool hasSensor = json_object_get(object.get(), member::kSensor) != nullptr;
+  if (hasSession == hasSensor) throw InputError("a dispatch needs either \"session\" or \"sensor\"");
+  if (hasSession) {
+    call.session = sessionMember(object);
+  } else {
+    call.sensor = sensorMember(object);
+  }
+}
+
+Json recordedMembers(const Json& object) {
+  if (json_object_get(object.get(), member::kReturned) == nullptr) return nullptr;
+  Json recorded(json_object());
+  for (const char* key : {member::kReturned, member::kProperties, member::kResult}) {
+    if (json_t* value = json_object_get(object.get(), key)) addMember(recorded, key, Json(json_incref(value)));
+  }
+  return recorded;
+}
+
+}  // namespace
+
+bool isNote(const Json& object) {
+  return json_object_get(object.get(), member::kCall) == nullptr &&
+         json_object_get(object.get(), member::kNote) != nullptr;
+}
+
+TraceCall readCall(const Json& object) {
+  TraceCall call;
+  call.kind = callMember(object);
+  call.recorded = recordedMembers(object);
+  switch (call.kind) {
+    case CallKind::open:
+      call.session = sessionMember(object);
+      call.sensor = sensorMember(object);
+      break;
+    case CallKind::setOption:
+      call.session = sessionMember(object);
+      call.option = optionMember(object);
+      break;
+    case CallKind::dispatch:
+      readTarget(object, call);
+      call.record = recordMember(object);
+      break;
+    case CallKind::close:
+      call.session = sessionMember(object);
+      break;
+    case CallKind::uninit:
+      break;
+  }
+  return call;
+}
+
+}  // namespace senseloom::tool

@@ -1,0 +1,30 @@
+#pragma once
+
+#include <cstddef>
+#include <optional>
+#include <string>
+
+#include "kinds/sensor_table.h"
+#include "trace/json.h"
+#include "trace/trace_form.h"
+
+namespace senseloom::tool {
+
+// One call of a trace.
+struct TraceCall {
+  size_t line = 0;
+  CallKind kind = CallKind::uninit;
+  std::string session;                // empty for uninit, and for a dispatch to a whole sensor
+  const Sensor* sensor = nullptr;     // of an open, and of a dispatch to a whole sensor
+  std::optional<std::string> option;  // of a set_option; nothing: a null pointer
+  Json record;                        // of a dispatch
+  Json recorded;                      // what a recording says of its outcome; null: nothing
+};
+
+// Whether a line's object is a note for readers, with no call.
+bool isNote(const Json& object);
+
+// The call of a line's object. Members beyond those of the call are ignored. Throws InputError if it has none.
+TraceCall readCall(const Json& object);
+
+}  // namespace senseloom::tool

@@ -1,0 +1,52 @@
+#pragma once
+
+#include <array>
+#include <cstddef>
+
+// The words that traces are made of, for those who write traces and for those who read them. docs/traces.md explains
+// their form.
+namespace senseloom::tool {
+
+enum class CallKind { open, setOption, dispatch, close, uninit };
+inline constexpr std::array kAllCalls{CallKind::open, CallKind::setOption, CallKind::dispatch, CallKind::close,
+                                      CallKind::uninit};
+
+// The name of a call in traces and in output.
+constexpr const char* callName(CallKind kind) {
+  constexpr const char* kNames[] = {"open", "set_option", "dispatch", "close", "uninit"};
+  return kNames[static_cast<size_t>(kind)];
+}
+
+namespace member {
+
+// A call.
+inline constexpr char kCall[] = "call";
+inline constexpr char kNote[] = "note";
+inline constexpr char kSession[] = "session";
+inline constexpr char kSensor[] = "sensor";
+inline constexpr char kOption[] = "option";
+inline constexpr char kOptionHex[] = "optionHex";
+inline constexpr char kRecord[] = "record";
+
+// What came of it.
+inline constexpr char kReturned[] = "returned";
+inline constexpr char kProperties[] = "properties";
+inline constexpr char kId[] = "id";
+inline constexpr char kSize[] = "size";
+inline constexpr char kValue[] = "value";
+inline constexpr char kResult[] = "result";
+
+// A record, a result: its bytes, or its fields beside those that a sensor names itself.
+inline constexpr char kHex[] = "hex";
+inline constexpr char kTimestamp[] = "timestamp";
+inline constexpr char kItems[] = "items";
+inline constexpr char kClass[] = "class";
+inline constexpr char kSequence[] = "seq";
+inline constexpr char kSamples[] = "samples";
+
+}  // namespace member
+
+// What an open returned that gave a session, in "returned".
+inline constexpr char kHandle[] = "handle";
+
+}  // namespace senseloom::tool

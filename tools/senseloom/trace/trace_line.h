@@ -1,0 +1,50 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <span>
+#include <string>
+#include <string_view>
+
+namespace senseloom::tool {
+
+// One line of a trace, a JSON object, put together member by member. It is written by hand and into one buffer: a
+// service that is recorded waits for it.
+class TraceLine {
+ public:
+  void clear() { buffer.clear(); }
+  bool isEmpty() const { return buffer.empty(); }
+
+  // A text becomes a string. JSON cannot hold what is not UTF-8, so a text beyond ASCII becomes its bytes, in a member
+  // with "Hex" at the end of its name.
+  void addText(std::string_view key, std::string_view text);
+  void addInteger(std::string_view key, int64_t value);
+  void addNull(std::string_view key);
+  // {"hex":"..."}, the form that the bytes of records have in a trace.
+  void addBytes(std::string_view key, std::span<const uint8_t> bytes);
+
+  // What is added before the matching end becomes part of an object or array. In an array, begin each element.
+  void beginArray(std::string_view key);
+  void endArray() { buffer += ']'; }
+  void beginObject(std::string_view key);
+  void beginElement();
+  void endObject() { buffer += '}'; }
+
+  // "returned": what the library returned. Of an open only whether it gave a handle is told.
+  void addReturned(int value);
+  void addOpened(bool hasHandle);
+  // An element of "properties": {"id","size","value"} with the value as hexadecimal digits.
+  void addProperty(int32_t id, std::span<const uint8_t> value);
+
+  // The whole line, with its line feed. Nothing is added to it after that.
+  std::string_view finish();
+
+ private:
+  void separate();
+  void addKey(std::string_view key);
+  void addQuoted(std::string_view text);
+
+  std::string buffer;
+};
+
+}  // namespace senseloom::tool
