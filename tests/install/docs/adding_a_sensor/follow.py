@@ -1,0 +1,89 @@
+#!/usr/bin/env python3
+"""Adds the sensor of docs/adding-a-sensor.md to a copy of the sources and uses it: follow.py ROOT BUILD OUTPUT"""
+
+import os
+import pathlib
+import shutil
+import subprocess
+import sys
+
+from page import apply
+from rebuild import CompileError, Rebuild
+
+FOLDERS = ["include", "model", "platform", "src", "tests", "tools"]
+
+SENSOR = """\
+SPIN: spin
+  key        default  range  out of range  merged to   note
+  classMask  15       1..15  becomes 15    bitwise or
+  speed      0        0..9   becomes 0     minimum
+  properties: 221 classMask, 222 speed
+"""
+RECEIVED = """\
+  line  call        session   sensor  return  outcome
+     2  open        left      SPIN    handle
+     3  set_option  left      SPIN    0       221 classMask=3, 222 speed=7
+     4  open        all       SPIN    handle
+     5  set_option  all       SPIN    0       221 classMask=15, 222 speed=4
+     6  dispatch    left      SPIN    0
+     7  dispatch    all       SPIN    1       timestamp=1 class=3
+     8  close       all       SPIN    1       221 classMask=3, 222 speed=7
+     9  close       left      SPIN    0
+"""
+
+
+def expect(what, holds, text):
+    if not holds:
+        sys.exit(f"{what}:\n{text}")
+
+
+def use(tool, cases, picture):
+    """Runs every command of the tool that knows the sensor."""
+
+    def run(*arguments):
+        done = subprocess.run([tool, *arguments], capture_output=True, text=True)
+        expect(f"senseloom {' '.join(arguments)} failed", done.returncode == 0, done.stdout + done.stderr)
+        return done.stdout
+
+    shown = run("sensors", "SPIN")
+    expect("sensors prints something else", shown == SENSOR, shown)
+    received = run("replay", "--all", "--plot", picture, cases)
+    expect("replay prints something else", received == RECEIVED, received)
+    drawn = pathlib.Path(picture).read_text()
+    expect("the picture does not show the class", "SPIN" in drawn and "class 3" in drawn, drawn)
+    reasons = run("explain", "SPIN", '{"speed":7}', '{"speed":4,"classMask":16}')
+    expect("explain does not know who decided", "minimum" in reasons and "unexplained" not in reasons, reasons)
+
+
+def forget_row(rebuild, tree):
+    """Without its row in the tool's table, the sensor is an error that names it."""
+    table = pathlib.Path(tree, "tools/senseloom/kinds/sensor_table.cpp")
+    rows = table.read_text().splitlines(keepends=True)
+    table.write_text("".join(row for row in rows if "SPIN" not in row))
+    try:
+        rebuild.target("senseloom_cli")
+    except CompileError as error:
+        expect("the compiler does not name the sensor", "Spin has no row in kSensors" in str(error), str(error))
+    else:
+        sys.exit("a sensor without its row compiles")
+
+
+def main():
+    root, build, output = (os.path.abspath(argument) for argument in sys.argv[1:])
+    shutil.rmtree(output, ignore_errors=True)
+    tree = os.path.join(output, "tree")
+    for folder in FOLDERS:
+        shutil.copytree(os.path.join(root, folder), os.path.join(tree, folder))
+    changed = apply(pathlib.Path(root, "docs/adding-a-sensor.md").read_text(), tree)
+
+    def rebuilding(folder):
+        return Rebuild(build, root, tree, changed, os.path.join(output, folder))
+
+    rebuild = rebuilding("build")
+    tool = rebuild.target("senseloom_cli")
+    os.environ["LD_LIBRARY_PATH"] = f"{output}/build/lib:{build}/lib"
+    use(tool, os.path.join(tree, "tests/cases/spin.jsonl"), os.path.join(output, "spin.svg"))
+    forget_row(rebuilding("build_without_row"), tree)
+
+
+main()
