@@ -56,7 +56,7 @@ TEST(CommandLine, RefusesWhatItDoesNotUnderstandWithStatus2) {
   }
 }
 
-TEST(CommandLine, ReportsOutputThatCanNotBeWrittenWithStatus1) {
+TEST(CommandLine, ReportsOutputThatCannotBeWrittenWithStatus1) {
   EXPECT_EQ(std::system("exec 2>/dev/null >/dev/full; '" TOOL_FILE "' sensors"), 1 << 8);
   EXPECT_EQ(std::system("exec 2>/dev/null >&-; '" TOOL_FILE "' sensors"), 1 << 8);
 }

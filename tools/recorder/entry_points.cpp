@@ -6,12 +6,12 @@
 #include "recorder.h"
 #include "senseloom.h"
 
-// The library's functions, as the program calls them: each makes the same call of the next definition, the library's,
-// and has it recorded.
+// The library's functions, as the program calls them: each passes the call on to the next definition, which is the
+// library's, and has it recorded.
 namespace senseloom::trace {
 namespace {
 
-// Never destroyed: programs close their sessions in destructors of their own, some after everything here is done.
+// Never destroyed: programs close sessions in destructors of their own, some of which run after those of this library.
 Recorder& recorder() {
   alignas(Recorder) static std::byte storage[sizeof(Recorder)];
   static Recorder* const instance = new (storage) Recorder;
@@ -22,14 +22,14 @@ Recorder& recorder() {
   recorder().atExit();
 }
 
-// Null when the program loaded the library for itself alone. It gets here then only by asking the loader for a function
-// of this name wherever it is.
+// Null if the library was loaded with local scope only. A program then gets here only by asking the loader for any
+// function of this name.
 template <class Function>
 Function* nextDefinition(const char* name) {
   return reinterpret_cast<Function*>(dlsym(RTLD_NEXT, name));
 }
 
-// Of the sensor that the call before this one was to open.
+// Whether there is the sensor that the last call tried to open.
 bool sensorExists(const char* name) {
   static const auto next = nextDefinition<decltype(getSensor)>("getSensor");
   return next != nullptr && next(name) != nullptr;

@@ -113,7 +113,7 @@ void Recorder::uninitialised() noexcept {
   });
 }
 
-// Makes a step towards a line. The program's errno is what the library left of it.
+// Makes a step towards a line, and leaves errno as the library left it.
 template <class Step>
 void Recorder::attempt(Step step) noexcept {
   const int error = errno;
@@ -126,7 +126,7 @@ void Recorder::attempt(Step step) noexcept {
   errno = error;
 }
 
-// Begins the line of a call on a session; returns whether it is a call that can be made again.
+// Begins the line of a call on a session. Returns whether a replay can make the call again.
 bool Recorder::begin(CallKind call, void* handle, bool hasArguments) {
   line.clear();
   if (!file.isWanted()) return false;

@@ -10,14 +10,14 @@
 
 namespace senseloom::trace {
 
-// Writes calls of the library to the trace, each when it has returned, as one line. A call comes in two steps: its
-// arguments before it is made, since they may be memory that it changes, then what it returned.
+// Writes calls of the library to the trace, one line each, when they have returned. Each call is recorded in two steps:
+// its arguments before it is made, since they may be in memory that it changes, and then what it returned.
 //
-// Sessions are called s1, s2 and so on, in the order of the calls that opened them. What a trace can not say (an
+// Sessions are named s1, s2 and so on, in the order of the calls that opened them. What a trace cannot express (an
 // argument that is NULL, a handle that is not open, a sensor that does not exist) is written as a note, for readers
-// only: the library refuses such calls and changes nothing, so a replay comes out the same without them.
+// only: the library refuses such calls and changes nothing, so a replay has the same outcome without them.
 //
-// Nothing here fails the caller: a line that can not be put together for want of memory counts as lost.
+// Recording never makes a call fail: a line for which there is not enough memory counts as lost.
 class Recorder {
  public:
   void opened(const char* sensor, bool exists, void* handle) noexcept;
@@ -42,8 +42,8 @@ class Recorder {
 
   TraceFile file;
   tool::TraceLine line;    // the call that is being made; empty when it is not to be written
-  bool hasResult = false;  // ... and whether the library looks at where its result is to go
-  uint32_t sessions = 0;   // that were ever opened
+  bool hasResult = false;  // whether the arguments of that call give the result a place to go
+  uint32_t sessions = 0;   // opened so far
   std::unordered_map<const void*, uint32_t> numbers;
 };
 

@@ -17,9 +17,8 @@ namespace {
 constexpr char kTag[] = "senseloom-trace";
 constexpr char kVariable[] = "SENSELOOM_TRACE";
 
-// Why a file that was opened can not be the trace; null when it can. A pipe may keep its writer waiting, or raise a
-// signal. What a file holds already is somebody's, such as the trace of the run before this one, which may have
-// crashed.
+// Why an opened file cannot be the trace; null if it can. A pipe may block its writer or raise a signal. A file with
+// content belongs to somebody: it may be the trace of an earlier run that crashed.
 const char* objection(int descriptor, const struct stat& file) {
   if (S_ISCHR(file.st_mode)) return nullptr;
   if (!S_ISREG(file.st_mode)) return "neither a file nor a device";
@@ -31,7 +30,7 @@ const char* objection(int descriptor, const struct stat& file) {
 
 bool TraceFile::isWanted() noexcept {
   if (owner == 0) open();
-  // A child has the same file open and the same sessions, so its calls would pass for its parent's.
+  // A child shares the file and the sessions, so its calls would look like its parent's.
   return isNamed && owner == getpid();
 }
 
@@ -61,7 +60,7 @@ void TraceFile::open() noexcept {
   const char* name = std::getenv(kVariable);
   isNamed = name != nullptr && *name != '\0';
   if (!isNamed) return;
-  // Not blocking: a pipe that nobody reads would keep its opener waiting.
+  // Without O_NONBLOCK, opening a pipe that nobody reads would wait.
   const int file = ::open(name, O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC | O_NOCTTY | O_NONBLOCK, S_IRUSR | S_IWUSR);
   if (file < 0 || fstat(file, &opened) != 0) {
     trouble = std::strerror(errno);
@@ -76,7 +75,7 @@ void TraceFile::open() noexcept {
   mostBytes = limit.rlim_cur;
 }
 
-// Writes both or nothing.
+// Writes both, or nothing.
 bool TraceFile::append(std::string_view note, std::string_view line) noexcept {
   struct stat now {};
   if (!isStillOpen(now)) {
@@ -97,7 +96,8 @@ bool TraceFile::append(std::string_view note, std::string_view line) noexcept {
   return false;
 }
 
-// Services close descriptors that they do not know when they go to the background, and soon use the numbers again.
+// Services close all descriptors that they do not know when they go to the background, and the numbers are soon in use
+// for something else.
 bool TraceFile::isStillOpen(struct stat& now) const noexcept {
   return fstat(descriptor, &now) == 0 && now.st_dev == opened.st_dev && now.st_ino == opened.st_ino;
 }

@@ -9,15 +9,15 @@
 
 namespace senseloom::trace {
 
-// The file that the environment variable SENSELOOM_TRACE names, written a line at a time by one process. It is opened
-// for the first line, so that programs that never call the library leave it alone; without the variable there is none.
+// The file named by the environment variable SENSELOOM_TRACE, written a line at a time by one process. It is opened for
+// the first line, so programs that never call the library do not touch it. Without the variable there is no file.
 //
-// Whatever goes wrong with it stays with it: no call fails, no signal is raised, and a line that can not be written
-// whole is left out and counted. The log says when that begins; a note in the file says how many lines are missing,
-// ahead of the next one that can be written, or else the log does at the end of the process.
+// Trouble with the file does not reach the program: no call fails, no signal is raised, and a line that cannot be
+// written whole is left out and counted. The log says when that begins. The number of missing lines is written as a
+// note before the next line that can be written, or else logged at the end of the process.
 class TraceFile {
  public:
-  // Whether this process is to write lines: not without a file, and not in a child of the process that opened it.
+  // Whether this process writes lines: it needs a file, and must not be a child of the process that opened it.
   bool isWanted() noexcept;
 
   void write(std::string_view line) noexcept;
@@ -33,8 +33,8 @@ class TraceFile {
 
   pid_t owner = 0;  // 0: not known yet whether a file is wanted
   bool isNamed = false;
-  int descriptor = -1;            // -1: not open,
-  const char* trouble = nullptr;  // ... for this reason
+  int descriptor = -1;            // -1: not open
+  const char* trouble = nullptr;  // why it is not
   struct stat opened {};
   rlim_t mostBytes = 0;
   size_t lost = 0;  // lines, since the last note

@@ -4,7 +4,7 @@
 
 namespace senseloom::tool {
 
-// What is wrong with what the user gave: the message says it to the user, and the tool ends with status 2.
+// Something is wrong with what the user gave. The tool prints the message and ends with status 2.
 class InputError : public std::runtime_error {
  public:
   using std::runtime_error::runtime_error;

@@ -125,14 +125,14 @@ TEST_F(PlotOf, ATraceThatStopsShortIsNotDrawn) {
   EXPECT_EQ(contentOf(file), "as it was");
 }
 
-TEST(PlotErrors, NameAFileThatCanNotBeWritten) {
+TEST(PlotErrors, NameAFileThatCannotBeWritten) {
   for (const char* command : {"replay", "explain"}) {
     const ToolRun run = runTool({command, "lift.jsonl", "--plot", "/no-such-folder/x.svg"});
-    EXPECT_EQ(run.err, "senseloom: /no-such-folder/x.svg: can not be written: No such file or directory\n");
+    EXPECT_EQ(run.err, "senseloom: /no-such-folder/x.svg: cannot be written: No such file or directory\n");
     EXPECT_EQ(run.out, "");
     EXPECT_EQ(run.status, 1);
     const ToolRun full = runTool({command, "lift.jsonl", "--plot", "/dev/full"});
-    EXPECT_EQ(full.err, "senseloom: /dev/full: can not be written: No space left on device\n");
+    EXPECT_EQ(full.err, "senseloom: /dev/full: cannot be written: No space left on device\n");
     EXPECT_EQ(full.status, 1);
   }
 }

@@ -5,7 +5,7 @@
 namespace senseloom::tool {
 namespace {
 
-TEST(SvgText, EscapesWhatXmlCanNotHold) {
+TEST(SvgText, EscapesWhatXmlCannotHold) {
   EXPECT_EQ(xmlText("a<b>&\"c\""), "a&lt;b&gt;&amp;&quot;c&quot;");
   EXPECT_EQ(xmlText("a\tb\n\x01"), "a?b??");
   EXPECT_EQ(xmlText("\xC3\xA9\xEF\xBF\xBE\xEF\xBF\xBF\xEF\xBF\xBD"), "\xC3\xA9??\xEF\xBF\xBD");

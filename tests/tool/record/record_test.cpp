@@ -73,7 +73,7 @@ TEST(Record, LeavesAnEmptyTraceOfAProgramThatDoesNotUseTheLibrary) {
   EXPECT_EQ(contentOf(trace.name), "");
 }
 
-TEST(Record, RefusesAProgramThatCanNotBeStarted) {
+TEST(Record, RefusesAProgramThatCannotBeStarted) {
   const ScratchFile trace("missing");
   const ToolRun run = recordTo(trace.name, {"/no/such/program"});
   EXPECT_EQ(run.err, "senseloom: /no/such/program: No such file or directory\n");
@@ -81,7 +81,7 @@ TEST(Record, RefusesAProgramThatCanNotBeStarted) {
   EXPECT_EQ(runTool({"record", "-o", trace.name}).status, 2);
 }
 
-TEST(Record, RefusesAFileThatCanNotBeWritten) {
+TEST(Record, RefusesAFileThatCannotBeWritten) {
   const ToolRun run = recordTo("/no/such/folder/trace", {TOOL_FILE, "--version"});
   EXPECT_EQ(run.err, "senseloom: /no/such/folder/trace: No such file or directory\n");
   EXPECT_EQ(run.out, "");

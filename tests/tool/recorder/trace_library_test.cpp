@@ -34,7 +34,7 @@ ToolRun runTraced(const std::string& file, const std::vector<std::string>& argum
   return runTool(arguments, input, environment);
 }
 
-TEST(TraceLibrary, WritesWhatATraceCanNotSayAsNotes) {
+TEST(TraceLibrary, WritesWhatATraceCannotSayAsNotes) {
   const ScratchFile trace("refused");
   EXPECT_EQ(recordTo(trace.name, {REFUSED_CALLS_FILE}).status, 0);
   EXPECT_EQ(contentOf(trace.name),
@@ -113,7 +113,7 @@ TEST(TraceLibrary, DoesNotDisturbAProgramWhenTheDiskIsFull) {
   expectUndisturbed(runTraced("/dev/full", kReplay, kOpen + kDispatch), "No space left on device", "3");
 }
 
-TEST(TraceLibrary, DoesNotDisturbAProgramWhenTheFileCanNotBeWritten) {
+TEST(TraceLibrary, DoesNotDisturbAProgramWhenTheFileCannotBeWritten) {
   expectUndisturbed(runTraced("/no/such/folder/trace", kReplay, kOpen + kDispatch), "No such file or directory", "3");
   expectUndisturbed(runTraced("/", kReplay, kOpen + kDispatch), "Is a directory", "3");
 }

@@ -39,7 +39,7 @@ TEST(ReplayCheck, AgreesWithARecording) {
   EXPECT_EQ(run.status, 0);
 }
 
-TEST(ReplayCheck, TellsAnotherReturnValue) {
+TEST(ReplayCheck, ShowsAnotherReturnValue) {
   expectDifference(R"("returned":-1)", R"("returned":0)",
                    "6: set_option of session \"s1\" differs from the recording\n"
                    "  expected: {\"returned\":0}\n"
@@ -50,7 +50,7 @@ TEST(ReplayCheck, TellsAnotherReturnValue) {
                    "  actual:   {\"returned\":\"handle\"}\n");
 }
 
-TEST(ReplayCheck, TellsAnotherProperty) {
+TEST(ReplayCheck, ShowsAnotherProperty) {
   expectDifference(
       R"("value":"02000000")", R"("value":"03000000")",
       "2: set_option of session \"s1\" differs from the recording\n"
@@ -60,7 +60,7 @@ TEST(ReplayCheck, TellsAnotherProperty) {
       "\n");
 }
 
-TEST(ReplayCheck, TellsALessOrAMore) {
+TEST(ReplayCheck, ShowsWhatIsMissingAndWhatIsTooMuch) {
   expectDifference(R"("returned":0})", R"("returned":0,"properties":[]})",
                    "5: dispatch of session \"s1\" differs from the recording\n"
                    "  expected: {\"returned\":0,\"properties\":[]}\n"
@@ -72,7 +72,7 @@ TEST(ReplayCheck, TellsALessOrAMore) {
                    "\n");
 }
 
-TEST(ReplayCheck, TellsAnotherResult) {
+TEST(ReplayCheck, ShowsAnotherResult) {
   expectDifference(R"("result":{"hex":"01)", R"("result":{"hex":"03)",
                    "4: dispatch of session \"s1\" differs from the recording\n"
                    R"(  expected: {"returned":1,"result":{"hex":"03000000000000000200"}})"
@@ -81,7 +81,7 @@ TEST(ReplayCheck, TellsAnotherResult) {
                    "\n");
 }
 
-TEST(ReplayCheck, TellsEveryDifference) {
+TEST(ReplayCheck, ShowsEveryDifference) {
   const ScratchFile trace("differences");
   std::ofstream(trace.name) << R"({"call":"open","session":"a","sensor":"LIFT","returned":null}
 {"call":"open","session":"b","sensor":"LIFT"}
@@ -106,7 +106,7 @@ TEST(ReplayCheck, CountsCallsWithoutARecordedResult) {
   EXPECT_EQ(run.status, 0);
 }
 
-TEST(ReplayCheck, StopsAtALineThatIsNoCall) {
+TEST(ReplayCheck, StopsAtALineThatIsNotACall) {
   const ToolRun run = checkText(std::string(kRecording) + "stop\n");
   EXPECT_EQ(run.out, "");
   EXPECT_EQ(run.err.rfind("senseloom: standard input:8: not JSON: ", 0), 0U) << run.err;

@@ -28,7 +28,7 @@ TEST(ReplayErrors, NamesAFileThatDoesNotExist) {
   EXPECT_EQ(run.status, 2);
 }
 
-TEST(ReplayErrors, NamesAFileThatCanNotBeRead) {
+TEST(ReplayErrors, NamesAFileThatCannotBeRead) {
   const ToolRun run = runTool({"replay", "../examples"});
   EXPECT_EQ(run.err, "senseloom: ../examples: cannot be read: Is a directory\n");
   EXPECT_EQ(run.status, 2);
@@ -40,14 +40,14 @@ TEST(ReplayErrors, NamesFileAndLine) {
   EXPECT_EQ(run.status, 2);
 }
 
-TEST(ReplayErrors, RefusesALineThatIsNoJson) {
+TEST(ReplayErrors, RefusesALineThatIsNotJson) {
   const ToolRun run = runTool({"replay", "-"}, kOpen + "\nclose a\n");
   EXPECT_EQ(run.err.rfind("senseloom: standard input:3: not JSON: ", 0), 0U) << run.err;
   EXPECT_EQ(run.out, kHeading + kOpenRow);
   EXPECT_EQ(run.status, 2);
 }
 
-TEST(ReplayErrors, RefusesALineThatIsNoCall) {
+TEST(ReplayErrors, RefusesALineThatIsNotACall) {
   expectError("[1]", "not a JSON object");
   expectError("{}", "missing \"call\"");
   expectError(R"({"call":true})", "\"call\" must be a string");

@@ -103,7 +103,7 @@ TEST(ReplayTable, CutsLongListsAndBytesShort) {
       "   end  close       c         DTWGS   0\n");
 }
 
-TEST(ReplayTable, ShowsResultsThatAreNoRecordAsBytes) {
+TEST(ReplayTable, ShowsResultsThatAreNotARecordAsBytes) {
   const ToolRun run = runTool({"replay", "-"}, R"({"call":"open","session":"a","sensor":"LIFT"}
 {"call":"dispatch","session":"a","record":{"hex":"0102ff"}}
 {"call":"dispatch","session":"a","record":{"hex":""}}
@@ -124,7 +124,7 @@ TEST(ReplayTable, IsEmptyForAnEmptyTrace) {
   EXPECT_EQ(run.status, 0);
 }
 
-TEST(ReplayJson, PrintsOneObjectACallAndSession) {
+TEST(ReplayJson, PrintsOneObjectPerCallAndSession) {
   const ToolRun run = runTool({"replay", "--json", "-"}, kTwoClients);
   EXPECT_EQ(run.out,
             R"({"line":1,"call":"open","session":"lock","sensor":"STAP","return":"handle"}
@@ -176,7 +176,7 @@ TEST(ReplayJson, ShowsATemplateOfFourBytesAsBytes) {
   EXPECT_NE(run.out.find(R"({"id":123,"name":"templateData","hex":"01020304"})"), std::string::npos) << run.out;
 }
 
-TEST(ReplayJson, HoldsResultsThatAreNoRecordAsHexAlone) {
+TEST(ReplayJson, HoldsResultsThatAreNotARecordAsHexAlone) {
   const ToolRun run = runTool({"replay", "--json", "-"}, R"({"call":"open","session":"a","sensor":"LIFT"}
 {"call":"dispatch","session":"a","record":{"hex":"0102FF"}}
 {"call":"dispatch","session":"a","record":{"hex":""}}

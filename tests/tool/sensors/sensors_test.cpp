@@ -32,7 +32,7 @@ TEST(Sensors, PrintsAllInTheirOrder) {
   EXPECT_EQ(position, out.size() + 1);
 }
 
-TEST(Sensors, TellsEveryKindOfRangeAndOfMerging) {
+TEST(Sensors, PrintsEveryKindOfRangeAndOfMerging) {
   const std::string activity = runTool({"sensors", "PHYAC"}).out;
   EXPECT_NE(activity.find("  logN        0        0..8     nearest bound  minimum"), std::string::npos) << activity;
   EXPECT_NE(activity.find("  weightVar   -1       0..      becomes -1     the one that started the merge"),

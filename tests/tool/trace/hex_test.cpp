@@ -20,7 +20,7 @@ TEST(Hex, FromHexReadsDigitsInEitherCase) {
   EXPECT_EQ(fromHex(""), Bytes{});
 }
 
-TEST(Hex, FromHexRefusesWhatIsNoPairOfDigits) {
+TEST(Hex, FromHexRefusesWhatIsNotAPairOfDigits) {
   for (const char* text : {"0", "abc", "0g", "g0", " 1", "1 ", "+1", "-1", "0x", "a1 b2"}) {
     EXPECT_EQ(fromHex(text), std::nullopt) << text;
   }

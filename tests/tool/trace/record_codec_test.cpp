@@ -130,7 +130,7 @@ TEST(RecordCodec, AcceptsHexOfAnyLengthInEitherCase) {
   EXPECT_EQ(encoded("PDR", R"({"hex":"aBCd01"})"), "abcd01");
 }
 
-TEST(RecordCodec, RefusesWhatIsNoHex) {
+TEST(RecordCodec, RefusesWhatIsNotHex) {
   const std::string message = "record field \"hex\" must be a string of hexadecimal digits, two a byte";
   EXPECT_EQ(errorOf("STAP", R"({"hex":"abc"})"), message);
   EXPECT_EQ(errorOf("STAP", R"({"hex":"zz"})"), message);

@@ -29,7 +29,7 @@ std::string_view textLine(TraceLine& line, std::string_view text) {
   return line.finish();
 }
 
-TEST(TraceLine, EscapesWhatAStringCanNotHold) {
+TEST(TraceLine, EscapesWhatAStringCannotHold) {
   TraceLine line;
   EXPECT_EQ(textLine(line, ""), "{\"option\":\"\"}\n");
   EXPECT_EQ(textLine(line, "{\"a\\b\": /~\x7f}"), "{\"option\":\"{\\\"a\\\\b\\\": /~\x7f}\"}\n");

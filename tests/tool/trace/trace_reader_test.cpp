@@ -218,7 +218,7 @@ TEST_F(TraceReading, GoesOnAfterALongLine) {
   EXPECT_EQ(reader.next()->line, 2U);
 }
 
-TEST_F(TraceReading, ReportsAFileThatCanNotBeOpened) {
+TEST_F(TraceReading, ReportsAFileThatCannotBeOpened) {
   try {
     TraceReader reader(testing::TempDir() + "no/such/file");
     FAIL() << "opened";

@@ -128,7 +128,7 @@ TEST_F(GestureEngine, DoesNotStartWithoutTheFileOfTheScript) {
   EXPECT_EQ(feed(true), kNone);
 }
 
-TEST_F(GestureEngine, DoesNotStartWithAScriptThatCanNotBeRead) {
+TEST_F(GestureEngine, DoesNotStartWithAScriptThatCannotBeRead) {
   const ScopedVariable directory("SENSELOOM_GESTURE_SCRIPT", ::testing::TempDir().c_str());
   EXPECT_FALSE(gesture_initial(0, 0));
   EXPECT_EQ(feed(true), kNone);

@@ -8,10 +8,10 @@
 namespace senseloom::tool {
 namespace {
 
-// The classes of this classifier.
+// The classes, as this classifier numbers them.
 enum Activity { unknown, sitting, walking, running, cycling, riding };
 
-// What an activity is easily mistaken for.
+// The classes that an activity is easily mistaken for.
 constexpr std::array<std::array<int, 3>, 6> kMistakes{{
     {unknown, unknown, unknown},
     {riding, unknown, walking},
@@ -28,8 +28,8 @@ struct Phase {
   uint32_t share;
 };
 
-// "logger" keeps what the classifier says, 64 decisions at a time; "nav" wants to know when the way of moving really
-// changed, and looks more closely on the way home; "fitness" cares for walking and running alone.
+// "logger" keeps what the classifier says, 64 decisions at a time; "nav" wants to know when the mode of travel really
+// changed, and looks more closely on the way home; "fitness" is interested in walking and running only.
 constexpr Phase kDay[] = {
     {R"({"call":"open","session":"logger","sensor":"PHYAC"}
 {"call":"set_option","session":"logger","option":{"logN":6,"summary":0}}
@@ -93,7 +93,7 @@ uint32_t CommuteGenerator::randomBelow(uint32_t bound) {
   return static_cast<uint32_t>((random() >> 32) * bound >> 32);
 }
 
-// One decision of the classifier: now and then wrong, and then often for a few decisions in a row.
+// One decision of the classifier: now and then wrong, often for a few decisions in a row.
 int CommuteGenerator::observe(int activity) {
   if (mistakes == 0 && randomBelow(18) == 0) {
     const auto& candidates = kMistakes[static_cast<size_t>(activity)];

@@ -7,8 +7,8 @@
 
 #include "option/option_description.h"
 
-// The library's descriptions of its options, which are data. Of what is code in the library the tool uses nothing but
-// the public interface.
+// The library's descriptions of its options, which are data. Otherwise the tool uses the library through its public
+// interface alone.
 namespace senseloom::tool {
 
 // One description a sensor.

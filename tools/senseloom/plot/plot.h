@@ -11,7 +11,7 @@
 namespace senseloom::tool {
 
 // Gathers what a picture of a replay shows, in memory that does not grow with the trace: for each sensor a lane with
-// the records, and a lane a client with what it received.
+// its records, and for each client a lane with what it received.
 class Plot final : public ReplayObserver {
  public:
   struct Group {
@@ -24,7 +24,7 @@ class Plot final : public ReplayObserver {
 
   const Timeline& time() const { return timeline; }
   const std::vector<Group>& sensorGroups() const { return groups; }
-  // Clients were left out, for there are too many for one picture.
+  // There were too many clients for one picture, so some were left out.
   bool isCut() const { return cut; }
 
  private:
@@ -36,7 +36,7 @@ class Plot final : public ReplayObserver {
   Timeline timeline;
   std::vector<Group> groups;
   size_t clients = 0;
-  size_t recordLine = 0;  // of the last record: one that goes to several sessions is seen several times
+  size_t recordLine = 0;  // of the last record, to recognise one that goes to several sessions
   uint64_t timestamp = 0;
   bool cut = false;
 };

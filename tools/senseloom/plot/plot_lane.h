@@ -17,10 +17,10 @@ class PlotLane {
   enum class Presence : uint8_t { same, opens, closes };
   struct Bin {
     RecordHues received;
-    RecordHues last;                     // ... of that, the last record
+    RecordHues last;                     // the last of the records received
     Presence presence = Presence::same;  // the last change within the bin
     bool asks = false;                   // an option was set
-    bool isRefused = false;              // ... and refused
+    bool isRefused = false;              // an option was set and refused
     bool negotiates = false;
   };
   struct Note {
@@ -32,7 +32,7 @@ class PlotLane {
 
   void receive(size_t bin, const RecordHues& record);
   void fold();
-  // Notes beyond a number that fits no picture are left out.
+  // Keeps as many notes as a picture can show, and drops further ones.
   void addNote(size_t bin, std::string text);
   Bin& at(size_t bin) { return bins[bin]; }
   const Bin& at(size_t bin) const { return bins[bin]; }

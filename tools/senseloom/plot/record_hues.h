@@ -11,15 +11,15 @@
 
 namespace senseloom::tool {
 
-// What a picture tells apart by colour: the classes 0 to 7 or the sets of the first three classes, all others, and
-// records that show no class.
+// What has a colour of its own in a picture: each of the classes 0 to 7, or each set of the first three classes; all
+// other classes together; and records that show no class.
 inline constexpr size_t kHues = 10;
 inline constexpr size_t kOtherHue = 8;
 inline constexpr size_t kPlainHue = 9;
 
 // What a picture shows of one or more records.
 struct RecordHues {
-  std::array<uint32_t, kHues> counts{};  // by hue; of the items, where a record has items with classes
+  std::array<uint32_t, kHues> counts{};  // by hue; where a record has decisions, of these
   uint32_t height = 0;                   // the greatest number of steps, or of items
   uint32_t records = 0;
 
@@ -29,7 +29,7 @@ struct RecordHues {
 // What a picture shows of one record of a sensor, or of one result.
 RecordHues huesOf(const Sensor& sensor, std::span<const uint8_t> record, bool isResult);
 
-// What a hue stands for. `names` are those of the classes from 0 on, as far as they have names.
+// The meaning of a hue. `names` are the names of the classes from 0 on, as far as they have any.
 std::string hueText(const Sensor& sensor, size_t hue, const std::vector<std::string>& names);
 
 }  // namespace senseloom::tool

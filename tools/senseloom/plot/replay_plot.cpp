@@ -16,7 +16,7 @@ struct CloseFile {
 using File = std::unique_ptr<std::FILE, CloseFile>;
 
 [[noreturn]] void fail(const std::string& name) {
-  throw std::runtime_error(name + ": can not be written: " + std::strerror(errno));
+  throw std::runtime_error(name + ": cannot be written: " + std::strerror(errno));
 }
 
 File open(const std::string& name, const char* mode) {
@@ -27,7 +27,7 @@ File open(const std::string& name, const char* mode) {
 
 }  // namespace
 
-// The file is opened for appending, which leaves what it holds alone until there is a new picture.
+// Opening the file for appending keeps its old content until there is a new picture.
 ReplayPlot::ReplayPlot(std::unique_ptr<ReplayObserver> replayOutput, std::string plotTitle, PlotArguments plotArguments)
     : output(std::move(replayOutput)), title(std::move(plotTitle)), arguments(std::move(plotArguments)) {
   open(arguments.file, "a");

@@ -16,8 +16,8 @@ struct PlotArguments {
   std::vector<std::string> classNames = {};  // from class 0 on
 };
 
-// Passes everything on to an output, and at the end writes a picture of the replay. Throws std::runtime_error when the
-// file can not be written: if it can not be opened, at once.
+// Passes everything on to an output, and at the end writes a picture of the replay. Throws std::runtime_error if the
+// file cannot be written, and does so at once if it cannot be opened.
 class ReplayPlot final : public ReplayObserver {
  public:
   ReplayPlot(std::unique_ptr<ReplayObserver> replayOutput, std::string plotTitle, PlotArguments plotArguments);

@@ -14,7 +14,7 @@ constexpr double kNarrowestEvent = 1;
 constexpr double kGap = 0.6;
 constexpr double kLowestShare = 0.06;  // of a lane's height
 
-// The one hue of a content; kHues when there are several.
+// The hue of a content that has only one; kHues if there are several.
 size_t onlyHue(const RecordHues& content) {
   const auto& counts = content.counts;
   const auto* first = std::find_if(counts.begin(), counts.end(), [](uint32_t count) { return count > 0; });
@@ -97,7 +97,7 @@ void SvgLane::drawEvents(const PlotLane& lane, uint32_t most) {
   }
 }
 
-// All four sides are rounded as they stand, so that bars side by side have one border.
+// The coordinates of all four sides are rounded, not the lengths, so that neighbouring bars share a border.
 void SvgLane::addBar(size_t hue, double x, double width, double bottom, double height) {
   const double base = box.top + box.height - bottom;
   paths[hue] += 'M' + coordinate(x) + ' ' + coordinate(base) + 'H' + coordinate(x + width) + 'V' +

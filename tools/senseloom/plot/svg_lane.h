@@ -9,7 +9,7 @@
 
 namespace senseloom::tool {
 
-// The class of what has a hue, in the style of a picture.
+// The name of a hue's class in the style sheet of a picture.
 std::string hueClass(size_t hue);
 
 // The place of a lane in a picture.
@@ -20,8 +20,8 @@ struct SvgBox {
   double height;
 };
 
-// Draws what a lane received: for each hue one path. Runs of one class become one bar, and a bin with several classes
-// a pile of their shares, the greatest at the bottom.
+// Draws what a lane received: one path for each hue. A run of one class becomes one bar, and a bin with several classes
+// a stack of their shares, the greatest at the bottom.
 class SvgLane {
  public:
   SvgLane(const Timeline& timeline, const Sensor& shownSensor, const SvgBox& place)

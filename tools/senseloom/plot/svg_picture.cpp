@@ -25,7 +25,7 @@ constexpr double kCharacter = 5.9;  // about the width of one, to keep texts apa
 constexpr size_t kMostNameCharacters = 18;
 constexpr int kMostAxisMarks = 8;
 
-// Both palettes, hue by hue, and what else has a colour.
+// Both palettes: the hues, and everything else that has a colour.
 struct ColourRow {
   const char* selector;
   const char* property;
@@ -153,7 +153,7 @@ class Picture {
     y += kClientStride - kNoteHeight;
   }
 
-  // Where the client has a session.
+  // The times at which the client has a session.
   void addPresence(const PlotLane& client) {
     double from = -1;
     const auto end = [&](double to) {
@@ -180,7 +180,7 @@ class Picture {
     addPath("tick", ticks);
   }
 
-  // What the client asks for, where it does; texts that would run into each other are left out.
+  // What the client asks for, at the time it does. A text that would run into the one before it is left out.
   void addAsks(const PlotLane& client) {
     y += kNoteHeight;
     double end = 0;
@@ -248,7 +248,7 @@ class Picture {
     return false;
   }
 
-  // What the marks mean, as far as there are any.
+  // The meaning of the marks that the picture has.
   void addKey() {
     const auto& groups = plot.sensorGroups();
     y += 26;

@@ -8,8 +8,8 @@
 
 namespace senseloom::tool {
 
-// Writes a plot as an SVG file that needs nothing else, on a light or a dark ground as the viewer prefers. `names` are
-// the names of the classes, from class 0 on, as far as they have any.
+// Writes a plot as a self-contained SVG file, on a light or a dark ground as the viewer prefers. `names` are the names
+// of the classes from 0 on, as far as they have any.
 void writeSvg(std::FILE* out, const Plot& plot, const std::string& title, const std::vector<std::string>& names);
 
 }  // namespace senseloom::tool

@@ -6,10 +6,10 @@
 
 namespace senseloom::tool {
 
-// Text as it may stand in XML. Characters that XML can not hold become question marks.
+// Text as it may stand in XML. Characters that XML cannot hold become question marks.
 std::string xmlText(std::string_view text);
 
-// The first characters of UTF-8 text; dots stand for those left out.
+// The first characters of a UTF-8 text, with dots in place of those left out.
 std::string shortened(std::string_view text, size_t most);
 
 // A coordinate with one decimal at most.
@@ -18,7 +18,8 @@ std::string coordinate(double value);
 // An integer with a comma before each three digits.
 std::string grouped(uint64_t number);
 
-// The least of 1, 2 and 5 times a power of ten that has at most `most` multiples in a span; for the marks of an axis.
+// The distance of the marks on an axis: the least of 1, 2 and 5 times a power of ten that has at most `most` multiples
+// in the span.
 double axisStep(double span, int most);
 
 }  // namespace senseloom::tool

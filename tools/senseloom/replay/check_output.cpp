@@ -32,7 +32,7 @@ Json recordingOf(const CallOutcome& outcome) {
 
 void CheckOutput::onOutcome(const CallOutcome& outcome) {
   if (outcome.call.recorded == nullptr) {
-    if (outcome.call.line != 0) ++unrecorded;  // the closing of a session at the end is no line
+    if (outcome.call.line != 0) ++unrecorded;  // closing a session at the end has no line
     return;
   }
   ++compared;

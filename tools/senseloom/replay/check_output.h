@@ -8,8 +8,8 @@
 
 namespace senseloom::tool {
 
-// Compares what each call came to with what the trace says of it, and prints where they differ. At the end prints the
-// number of calls compared, or throws std::runtime_error with the number of those that differ.
+// Compares the outcome of each call with the recorded one, and prints the differences. At the end it prints the number
+// of calls compared, or throws std::runtime_error with the number of those that differ.
 class CheckOutput final : public ReplayObserver {
  public:
   CheckOutput(std::FILE* stream, const TraceReader& reader) : out(stream), trace(reader) {}

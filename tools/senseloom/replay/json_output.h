@@ -6,9 +6,9 @@
 
 namespace senseloom::tool {
 
-// Prints one JSON object per call and session. What it holds depends on the call alone, not on what came of it:
+// Prints one JSON object per call and session. Which members it has depends on the call alone, not on its outcome:
 //
-//   "line"        line of the trace; null: the closing of a session that the trace left open
+//   "line"        line of the trace; null: closing a session that the trace left open
 //   "call"        as in the trace
 //   "session"     its name (not for uninit)
 //   "sensor"      its sensor's name (not for uninit)

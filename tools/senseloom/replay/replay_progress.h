@@ -11,8 +11,8 @@
 
 namespace senseloom::tool {
 
-// Passes everything on to an output, and shows how much of the trace was read in the meantime. The bar is gone before
-// the output says what it has to say at the end.
+// Passes everything on to an output, and shows meanwhile how much of the trace was read. The bar disappears before the
+// output prints its end.
 class ReplayProgress final : public ReplayObserver {
  public:
   ReplayProgress(std::unique_ptr<ReplayObserver> replayOutput, const TraceReader& reader, std::FILE* terminal)
@@ -27,7 +27,7 @@ class ReplayProgress final : public ReplayObserver {
 };
 
 // Adds a bar on standard error to an output for a trace of 1 MiB or more, when standard error is a terminal.
-// `isFilling`: the output prints as the trace goes, so on a terminal of its own the output is all that is to be seen.
+// `isFilling`: the output prints as the replay goes on, so where it goes to a terminal it leaves no room for a bar.
 std::unique_ptr<ReplayObserver> withProgress(std::unique_ptr<ReplayObserver> output, const TraceReader& trace,
                                              std::FILE* out, bool isFilling);
 

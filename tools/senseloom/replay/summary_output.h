@@ -10,7 +10,7 @@
 namespace senseloom::tool {
 
 // Prints, at the end, a row for each client: how often it was opened, the records it was given, the results it got, and
-// how many of its calls failed. The sessions that one name has on one sensor, one after the other, are one client. Rows
+// how many of its calls failed. Sessions of the same name on the same sensor, one after the other, are one client. Rows
 // are in the order of the first opening.
 class SummaryOutput final : public ReplayObserver {
  public:

@@ -9,8 +9,8 @@
 
 namespace senseloom::tool {
 
-// Prints a table for people as the trace goes: a row a call and session, with what came of it in words. Long lists are
-// cut short.
+// Prints a table for people, as the replay goes on: one row per call and session, with the outcome in words. Long lists
+// are cut short.
 class TableOutput final : public ReplayObserver {
  public:
   // Records that delivered nothing have rows only if `withAll` is set.

@@ -6,8 +6,8 @@
 
 namespace senseloom::tool {
 
-// A bar on a terminal that says how much of some work is done. It leaves the cursor at the start of its line, so that a
-// line that somebody else prints covers it, and it is gone at its end.
+// A bar on a terminal that shows how much of some work is done. It leaves the cursor at the start of its line, so that
+// whatever else is printed overwrites it. Its destructor removes it.
 class ProgressBar {
  public:
   using Clock = std::chrono::steady_clock;

@@ -23,7 +23,7 @@ struct Property {
 };
 using PropertyList = std::vector<Property>;
 
-// What a call of a trace came to for one session. It refers to the replayer's own data, which the next call changes.
+// The outcome of a call for one session. It refers to the replayer's own data, which the next call changes.
 struct CallOutcome {
   const TraceCall& call;                                  // line 0: the closing of a session that the trace left open
   const std::string& session;                             // empty for uninit
@@ -43,14 +43,14 @@ class ReplayObserver {
   virtual void onEnd() {}
 };
 
-// Makes the calls of a trace, through the library's C interface, and tells an observer what each came to.
+// Makes the calls of a trace, through the library's C interface, and reports the outcome of each to an observer.
 //
-// A session whose opening failed keeps its name, with a null pointer as its handle: calls that name it are made, and
+// A session that failed to open keeps its name, with a null pointer as its handle: calls that name it are made, and
 // fail. It is not on its sensor, so a dispatch to the whole sensor leaves it out, and its name may be opened again.
 class Replayer {
  public:
   explicit Replayer(ReplayObserver& listener) : observer(listener) {}
-  // Closes the sessions that are open, without telling the observer.
+  // Closes the sessions that are open, without reporting it.
   ~Replayer() = default;
   Replayer(const Replayer&) = delete;
   Replayer& operator=(const Replayer&) = delete;

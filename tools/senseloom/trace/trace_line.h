@@ -23,14 +23,14 @@ class TraceLine {
   // {"hex":"..."}, the form that the bytes of records have in a trace.
   void addBytes(std::string_view key, std::span<const uint8_t> bytes);
 
-  // What is added before the matching end becomes part of an object or array. In an array, begin each element.
+  // What is added up to the matching end becomes part of the object or array. An element is an object in an array.
   void beginArray(std::string_view key);
   void endArray() { buffer += ']'; }
   void beginObject(std::string_view key);
   void beginElement();
   void endObject() { buffer += '}'; }
 
-  // "returned": what the library returned. Of an open only whether it gave a handle is told.
+  // "returned": what the library returned; for an open, whether it returned a handle.
   void addReturned(int value);
   void addOpened(bool hasHandle);
   // An element of "properties": {"id","size","value"} with the value as hexadecimal digits.

@@ -1,5 +1,5 @@
 /*
- * Makes calls that a trace can not say beside some that it can. Returns the number of results that are not the
+ * Makes calls that a trace cannot say beside some that it can. Returns the number of results that are not the
  * library's.
  */
 #include <senseloom.h>
