@@ -1,8 +1,8 @@
-// The aware audio module of a Linux host. It has no hardware behind it: it checks what a caller does with the device
+// The aware audio module of a Linux host. There is no hardware behind it: it checks what a caller does with the device
 // and logs it.
 //
-// For trying out failures, each step fails on demand while an environment variable has a value other than the empty
-// string. The variables are read anew at each call:
+// To try out failures, each step can be made to fail by an environment variable that is not empty. The variables are
+// read at each call:
 //
 //   SENSELOOM_AWARE_FAIL_OPEN        opening returns -EIO
 //   SENSELOOM_AWARE_NULL_DEVICE      opening returns 0 and no device
@@ -25,7 +25,7 @@ namespace {
 
 constexpr char kTag[] = "aware_hal";
 
-// The only session that this hardware has.
+// The parameters of the only session that this hardware has.
 constexpr aware_parameters_t kParameters = {
     .word0 = 128,
     .half4 = 12,
@@ -60,7 +60,7 @@ int refuse(int result, const char* step, const char* reason) {
   return result;
 }
 
-// The offset of the first byte that is not as the hardware wants it; the size of the block when there is none.
+// The offset of the first byte that differs from what the hardware wants; the size of the block if none does.
 std::size_t firstWrongByte(const aware_parameters_t& parameters) {
   const auto* const given = reinterpret_cast<const unsigned char*>(&parameters);
   const auto* const wanted = reinterpret_cast<const unsigned char*>(&kParameters);
@@ -107,7 +107,7 @@ int closeDevice(hw_device_t* common) {
   // The common header is the first member of the device.
   const auto* const device = static_cast<AwareDevice*>(reinterpret_cast<aware_hw_device_t*>(common));
   const bool wasActive = device->active;
-  // Whatever the result: a caller that is done with a device does not come back to try again.
+  // Also when closing fails: a caller that is done with a device does not try again.
   delete device;
   if (isDemanded("SENSELOOM_AWARE_FAIL_CLOSE")) return refuse(-EIO, "close", "failure on demand");
   __android_log_print(ANDROID_LOG_DEBUG, kTag, wasActive ? "close: closed while active" : "close: closed");
@@ -125,7 +125,8 @@ int openDevice(const hw_module_t* module, const char* id, hw_device_t** out) {
   device->common.tag = HARDWARE_DEVICE_TAG;
   device->common.version =
       isDemanded("SENSELOOM_AWARE_WRONG_VERSION") ? HARDWARE_DEVICE_API_VERSION(1, 0) : AWARE_DEVICE_API_VERSION_2_0;
-  device->common.module = const_cast<hw_module_t*>(module);  // const on the way in alone
+  device->common.module =
+      const_cast<hw_module_t*>(module);  // the interface takes it as const but keeps it as not const
   device->common.close = closeDevice;
   device->activate = activate;
   device->deactivate = deactivate;
@@ -139,7 +140,7 @@ hw_module_methods_t methods = {.open = openDevice};
 
 }  // namespace
 
-// Not const: the loader writes its handle into it.
+// Not const, since the loader stores its handle in it.
 extern "C" hw_module_t HAL_MODULE_INFO_SYM;
 hw_module_t HAL_MODULE_INFO_SYM = {
     .tag = HARDWARE_MODULE_TAG,

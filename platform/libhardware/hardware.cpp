@@ -18,9 +18,9 @@ namespace {
 constexpr char kTag[] = "libhardware";
 constexpr char kPathVariable[] = "SENSELOOM_HW_MODULE_PATH";
 
-// Whether the directory has a readable file of that name; its path is then in `path`.
+// Whether the directory has a readable file of that name. If so, its path is in `path`.
 bool findIn(std::string_view directory, const char* name, char (&path)[PATH_MAX]) {
-  if (directory.empty()) return false;  // and not the working directory: code from there would be loaded by accident
+  if (directory.empty()) return false;  // not the working directory, whose code would be loaded by accident
   const int length =
       std::snprintf(path, sizeof path, "%.*s/%s", static_cast<int>(directory.size()), directory.data(), name);
   return length > 0 && static_cast<std::size_t>(length) < sizeof path && access(path, R_OK) == 0;
@@ -37,7 +37,7 @@ bool findInList(std::string_view list, const char* name, char (&path)[PATH_MAX])
 
 bool findBesideThisLibrary(const char* name, char (&path)[PATH_MAX]) {
   Dl_info library;
-  // A local object, since the address of an exported function may be one in the executable.
+  // An object of this file, since the address of an exported function may lie in the executable.
   if (dladdr(kTag, &library) == 0) return false;
   const std::string_view file = library.dli_fname;
   const std::size_t slash = file.rfind('/');
@@ -74,7 +74,7 @@ int hw_get_module_by_class(const char* class_id, const char* inst, const hw_modu
   char name[NAME_MAX + 1];
   const int length = inst != nullptr ? std::snprintf(name, sizeof name, "%s.%s.default.so", class_id, inst)
                                      : std::snprintf(name, sizeof name, "%s.default.so", class_id);
-  // A name cut short could be that of another module.
+  // A truncated name could be that of another module.
   if (length < 0 || static_cast<std::size_t>(length) >= sizeof name) return -ENAMETOOLONG;
 
   const char* const list = std::getenv(kPathVariable);

@@ -11,6 +11,8 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "trace/trace_form.h"
+
 namespace senseloom::trace {
 namespace {
 
@@ -38,7 +40,8 @@ void TraceFile::write(std::string_view line) noexcept {
   if (descriptor < 0) return lose(trouble);
   char note[80];
   const int noteLength =
-      lost == 0 ? 0 : std::snprintf(note, sizeof note, "{\"note\":\"lines missing here: %zu\"}\n", lost);
+      lost == 0 ? 0
+                : std::snprintf(note, sizeof note, "{\"%s\":\"lines missing here: %zu\"}\n", tool::member::kNote, lost);
   if (append({note, static_cast<size_t>(noteLength)}, line)) {
     lost = 0;
   } else {

@@ -1,6 +1,6 @@
 /*
- * The aware audio device: the part of the audio hardware that listens by itself while its session is active. The
- * layouts are the binary interface between the module and its callers.
+ * The aware audio device: the part of the audio hardware that keeps listening while its session is active. The layouts
+ * are the binary interface between the module and its callers.
  */
 #pragma once
 
@@ -47,8 +47,8 @@ typedef struct aware_hw_device {
   int (*deactivate)(struct aware_hw_device* device);
 
   /*
-   * Copies the parameters that the session was activated with. Returns 0, or -EINVAL when it is not active. Of the host's
-   * module alone; libsenseloom does not call it.
+   * Copies the parameters that the session was activated with. Returns 0, or -EINVAL when it is not active. Of the
+   * host's module alone; libsenseloom does not call it.
    */
   int (*get_parameters)(const struct aware_hw_device* device, aware_parameters_t* parameters);
 } aware_hw_device_t;

@@ -1,6 +1,6 @@
 /*
  * The platform's hardware modules: how a module presents itself and its devices, and how it is found. The layouts are
- * the binary interface between loader, modules and callers, which may each be built on their own.
+ * the binary interface between loader, modules and callers, which may be built separately.
  */
 #pragma once
 
@@ -82,8 +82,8 @@ int hw_get_module(const char* id, const struct hw_module_t** module);
  * SENSELOOM_HW_MODULE_PATH, separated by colons (empty entries are skipped), then the directory of this library.
  *
  * Returns 0 with the module in `*module`; it stays loaded. Otherwise NULL in `*module` and: -ENAMETOOLONG when no file
- * could have that name, -ENOENT when no directory has the module, -EINVAL when the file found is no module of that
- * class.
+ * could have that name, -ENOENT when no directory has the module, -EINVAL when the file found is not a module of
+ * that class.
  */
 int hw_get_module_by_class(const char* class_id, const char* inst, const struct hw_module_t** module);
 
