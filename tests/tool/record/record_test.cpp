@@ -9,11 +9,11 @@
 namespace senseloom::tool {
 namespace {
 
-class RecordedExample : public testing::TestWithParam<const char*> {};
+class RecordedExample : public testing::TestWithParam<std::string> {};
 
 TEST_P(RecordedExample, IsReplayedAsRecorded) {
   const ScratchFile trace(GetParam());
-  const std::string example = std::string(GetParam()) + ".jsonl";
+  const std::string example = GetParam() + ".jsonl";
   const ToolRun recorded = recordTo(trace.name, {TOOL_FILE, "replay", "--log", "none", "--all", example});
   EXPECT_EQ(recorded.status, 0) << recorded.err;
   // The recording changes nothing of what the program prints.
@@ -27,11 +27,8 @@ TEST_P(RecordedExample, IsReplayedAsRecorded) {
   EXPECT_EQ(checked.status, 0);
 }
 
-INSTANTIATE_TEST_SUITE_P(EverySensor, RecordedExample,
-                         testing::Values("commute", "tapping", "gesture_flick", "shaking", "instant_activity",
-                                         "step_count", "gesture_hmm", "dtwgs", "gesture_eartouch",
-                                         "audio_classification", "pdr", "lift"),
-                         [](const auto& example) { return std::string(example.param); });
+INSTANTIATE_TEST_SUITE_P(All, RecordedExample, testing::ValuesIn(exampleNames()),
+                         [](const auto& example) { return example.param; });
 
 TEST(Record, RecordsAProgramThatUsesTheLibrary) {
   const ScratchFile trace("embed");

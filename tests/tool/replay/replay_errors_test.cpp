@@ -13,7 +13,7 @@ const std::string kOpen = R"({"call":"open","session":"a","sensor":"STAP"})"
 const std::string kHeading = "  line  call        session   sensor  return  outcome\n";
 const std::string kOpenRow = "     1  open        a         STAP    handle\n";
 
-// What a trace that opens session "a" on "STAP", and then goes on with `line`, is told.
+// Replays a trace that opens session "a" on "STAP" and goes on with `line`, and expects that to be an error.
 void expectError(const std::string& line, const std::string& message) {
   const ToolRun run = runTool({"replay", "-"}, kOpen + line + "\n");
   EXPECT_EQ(run.err, "senseloom: standard input:2: " + message + "\n") << line;
@@ -49,29 +49,8 @@ TEST(ReplayErrors, RefusesALineThatIsNotJson) {
 
 TEST(ReplayErrors, RefusesALineThatIsNotACall) {
   expectError("[1]", "not a JSON object");
-  expectError("{}", "missing \"call\"");
-  expectError(R"({"call":true})", "\"call\" must be a string");
-  expectError(R"({"call":"reopen"})",
-              "unknown call \"reopen\": open, set_option, dispatch, close and uninit are known");
-}
-
-TEST(ReplayErrors, RefusesMissingAndMistypedMembers) {
-  expectError(R"({"call":"open","sensor":"STAP"})", "missing \"session\"");
-  expectError(R"({"call":"open","session":"b"})", "missing \"sensor\"");
-  expectError(R"({"call":"open","session":1,"sensor":"STAP"})", "\"session\" must be a string");
-  expectError(R"({"call":"open","session":"","sensor":"STAP"})", "\"session\" must not be empty");
-  expectError(R"({"call":"set_option","session":"a"})", "missing \"option\"");
-  expectError(R"({"call":"set_option","session":"a","option":1})", "\"option\" must be an object, a string or null");
-  expectError(R"({"call":"dispatch","session":"a"})", "missing \"record\"");
-  expectError(R"({"call":"dispatch","session":"a","record":[]})", "\"record\" must be an object");
-  expectError(R"({"call":"dispatch","record":{"hex":""}})", "a dispatch needs either \"session\" or \"sensor\"");
-  expectError(R"({"call":"close"})", "missing \"session\"");
-}
-
-TEST(ReplayErrors, RefusesUnknownSensors) {
-  const std::string message = "unknown sensor \"TAP\": `senseloom sensors` prints those that are known";
-  expectError(R"({"call":"open","session":"b","sensor":"TAP"})", message);
-  expectError(R"({"call":"dispatch","sensor":"TAP","record":{"hex":""}})", message);
+  expectError(R"({"call":"open","session":"b","sensor":"TAP"})",
+              "unknown sensor \"TAP\": `senseloom sensors` prints those that are known");
 }
 
 TEST(ReplayErrors, RefusesSessionsThatAreNotOpen) {
@@ -96,14 +75,7 @@ TEST(ReplayErrors, RefusesTheNameOfAnOpenSessionForAnother) {
 TEST(ReplayErrors, RefusesRecordsThatAreNotOfTheirSensor) {
   expectError(R"({"call":"dispatch","session":"a","record":{"timestamp":1,"class":1}})",
               "unknown record field \"class\"");
-  expectError(R"({"call":"dispatch","sensor":"STAP","record":{"timestamp":1}})", "missing record field \"classes\"");
-  expectError(R"({"call":"dispatch","session":"a","record":{"timestamp":1,"classes":"3"}})",
-              "record field \"classes\" must be an integer from -32768 to 32767");
-  expectError(R"({"call":"dispatch","sensor":"STAP","record":{"timestamp":1,"classes":32768}})",
-              "record field \"classes\" must be an integer from -32768 to 32767");
-  expectError(R"({"call":"dispatch","session":"a","record":{"hex":"0"}})",
-              "record field \"hex\" must be a string of hexadecimal digits, two a byte");
-  // ... even when no session would get it.
+  // Even if no session would get it.
   expectError(R"({"call":"dispatch","sensor":"LIFT","record":{}})", "missing record field \"timestamp\"");
 }
 

@@ -1,7 +1,6 @@
 #include <gtest/gtest.h>
 
 #include <cstdlib>
-#include <sstream>
 #include <string>
 
 #include "recording.h"
@@ -20,14 +19,8 @@ std::string offeredAfter(const std::string& command) {
 }
 
 TEST(Completion, OffersEverySensorOfTheTool) {
-  std::istringstream objects(runTool({"sensors", "--json"}).out);
   std::string sensors;
-  const std::string start = R"({"sensor":")";
-  for (std::string object; std::getline(objects, object);) {
-    const size_t end = object.find('"', start.size());
-    sensors += object.substr(start.size(), end - start.size()) + '\n';
-  }
-  EXPECT_EQ(sensors.substr(0, 11), "PHYAC\nSTAP\n");
+  for (const std::string& name : sensorNames()) sensors += name + '\n';
   EXPECT_EQ(offeredAfter("sensors"), sensors);
   EXPECT_EQ(offeredAfter("explain"), sensors);
 }

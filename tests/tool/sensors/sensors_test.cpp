@@ -22,10 +22,9 @@ TEST(Sensors, PrintsOneSensor) {
 TEST(Sensors, PrintsAllInTheirOrder) {
   const std::string out = runTool({"sensors"}).out;
   size_t position = 0;
-  for (const char* sensor :
-       {"PHYAC", "STAP", "GSFLK", "SHAKI", "ISACT", "SCOUN", "GSPX", "DTWGS", "GSETH", "LPE_P", "PDR", "LIFT"}) {
+  for (const std::string& sensor : sensorNames()) {
     const std::string block = runTool({"sensors", sensor}).out;
-    EXPECT_EQ(block.rfind(std::string(sensor) + ": ", 0), 0U);
+    EXPECT_EQ(block.rfind(sensor + ": ", 0), 0U);
     EXPECT_EQ(out.substr(position, block.size()), block);
     position += block.size() + 1;  // a blank line between two
   }

@@ -9,9 +9,11 @@
 #include <algorithm>
 #include <cstdio>
 #include <cstdlib>
+#include <filesystem>
 #include <fstream>
 #include <iterator>
 #include <memory>
+#include <sstream>
 
 namespace senseloom::tool {
 namespace {
@@ -74,6 +76,27 @@ std::string contentOf(const std::string& file) {
   std::ifstream stream(file, std::ios::binary);
   EXPECT_TRUE(stream.is_open()) << file;
   return {std::istreambuf_iterator<char>(stream), {}};
+}
+
+std::vector<std::string> sensorNames() {
+  const std::string start = R"({"sensor":")";
+  std::istringstream objects(runTool({"sensors", "--json"}).out);
+  std::vector<std::string> names;
+  for (std::string object; std::getline(objects, object);) {
+    EXPECT_EQ(object.substr(0, start.size()), start);
+    names.push_back(object.substr(start.size(), object.find('"', start.size()) - start.size()));
+  }
+  EXPECT_GE(names.size(), 12U);
+  return names;
+}
+
+std::vector<std::string> exampleNames() {
+  std::vector<std::string> names;
+  for (const auto& entry : std::filesystem::directory_iterator(EXAMPLES_FOLDER)) {
+    if (entry.path().extension() == ".jsonl") names.push_back(entry.path().stem());
+  }
+  std::sort(names.begin(), names.end());
+  return names;
 }
 
 }  // namespace senseloom::tool

@@ -22,4 +22,10 @@ ToolRun runTool(std::vector<std::string> arguments, const std::string& input = "
 // The content of a file.
 std::string contentOf(const std::string& file);
 
+// The names of all sensors, in the order in which the tool prints them.
+std::vector<std::string> sensorNames();
+
+// The names of all example traces, without ".jsonl".
+std::vector<std::string> exampleNames();
+
 }  // namespace senseloom::tool

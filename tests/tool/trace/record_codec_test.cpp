@@ -99,7 +99,7 @@ const Sample kSamples[] = {
      R"({"timestamp":1000,"items":[")" + kItem1 + R"(",")" + kItem2 + R"("]})"},
     {"LIFT", R"({"timestamp":1000,"class":0})", "e8030000000000000000", R"({"timestamp":1000,"class":0})"},
 };
-INSTANTIATE_TEST_SUITE_P(EverySensor, RecordOfKind, testing::ValuesIn(kSamples),
+INSTANTIATE_TEST_SUITE_P(All, RecordOfKind, testing::ValuesIn(kSamples),
                          [](const auto& sample) { return std::string(sample.param.sensor); });
 
 TEST(RecordCodec, EncodesRecordsWithoutElements) {

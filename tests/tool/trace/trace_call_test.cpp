@@ -1,0 +1,121 @@
+#include "trace/trace_call.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+#include <utility>
+
+#include "input_error.h"
+
+namespace senseloom::tool {
+namespace {
+
+Json parsed(const std::string& text) {
+  return Json(json_loads(text.c_str(), 0, nullptr));
+}
+
+TraceCall callOf(const std::string& line) {
+  return readCall(parsed(line));
+}
+
+std::string errorOf(const std::string& line) {
+  try {
+    callOf(line);
+    return "no error";
+  } catch (const InputError& error) {
+    return error.what();
+  }
+}
+
+TEST(TraceCall, OpensASessionOnASensor) {
+  const TraceCall call = callOf(R"({"call":"open","session":"nav","sensor":"PHYAC"})");
+  EXPECT_EQ(call.kind, CallKind::open);
+  EXPECT_EQ(call.session, "nav");
+  EXPECT_EQ(call.sensor, findSensor("PHYAC"));
+}
+
+TEST(TraceCall, DispatchesARecordToASession) {
+  const TraceCall call = callOf(R"({"call":"dispatch","session":"nav","record":{"hex":"00"}})");
+  EXPECT_EQ(call.kind, CallKind::dispatch);
+  EXPECT_EQ(call.session, "nav");
+  EXPECT_EQ(call.sensor, nullptr);
+  EXPECT_EQ(compactText(call.record.get()), R"({"hex":"00"})");
+}
+
+TEST(TraceCall, DispatchesARecordToASensor) {
+  const TraceCall call = callOf(R"({"call":"dispatch","sensor":"STAP","record":{"hex":"01"}})");
+  EXPECT_EQ(call.session, "");
+  EXPECT_EQ(call.sensor, findSensor("STAP"));
+}
+
+TEST(TraceCall, ClosesASessionWhateverElseItsLineHolds) {
+  const TraceCall call = callOf(R"({"call":"close","session":"nav","note":"home","return":0})");
+  EXPECT_EQ(call.kind, CallKind::close);
+  EXPECT_EQ(call.session, "nav");
+  EXPECT_EQ(call.recorded, nullptr);
+}
+
+TEST(TraceCall, PassesAnOptionGivenAsAStringOnAsItStands) {
+  EXPECT_EQ(callOf(R"({"call":"set_option","session":"a","option":" {\"mode\": 1,"})").option, R"( {"mode": 1,)");
+}
+
+TEST(TraceCall, WritesAnOptionGivenAsAnObjectWithoutBlanks) {
+  const TraceCall call = callOf(R"({"call":"set_option","session":"nav","option":{"logN":3, "mode":1}})");
+  EXPECT_EQ(call.kind, CallKind::setOption);
+  EXPECT_EQ(call.session, "nav");
+  EXPECT_EQ(call.option, R"({"logN":3,"mode":1})");
+}
+
+TEST(TraceCall, TakesANullOptionForANullPointer) {
+  EXPECT_EQ(callOf(R"({"call":"set_option","session":"a","option":null})").option, std::nullopt);
+}
+
+TEST(TraceCall, TakesAnOptionGivenAsBytes) {
+  EXPECT_EQ(callOf(R"({"call":"set_option","session":"a","optionHex":"7bff00"})").option, std::string("{\xff\0", 3));
+}
+
+TEST(TraceCall, HasItsRecordedOutcome) {
+  const auto recorded = [](const std::string& members) {
+    const TraceCall call = callOf(R"({"call":"close","session":"a")" + members + "}");
+    return call.recorded == nullptr ? "nothing" : compactText(call.recorded.get());
+  };
+  EXPECT_EQ(recorded(R"(,"properties":[],"returned":1,"note":"x","result":{})"),
+            R"({"returned":1,"properties":[],"result":{}})");
+  EXPECT_EQ(recorded(R"(,"returned":null)"), R"({"returned":null})");
+  EXPECT_EQ(recorded(R"(,"properties":[])"), "nothing");
+}
+
+TEST(TraceCall, RefusesMissingAndMistypedMembers) {
+  const std::pair<const char*, const char*> lines[] = {
+      {R"({"call":1})", "\"call\" must be a string"},
+      {R"({"call":"opne"})", "unknown call \"opne\": open, set_option, dispatch, close and uninit are known"},
+      {R"({"call":"open","sensor":"STAP"})", "missing \"session\""},
+      {R"({"call":"open","session":7,"sensor":"STAP"})", "\"session\" must be a string"},
+      {R"({"call":"open","session":"","sensor":"STAP"})", "\"session\" must not be empty"},
+      {R"({"call":"open","session":"a"})", "missing \"sensor\""},
+      {R"({"call":"open","session":"a","sensor":null})", "\"sensor\" must be a string"},
+      {R"({"call":"open","session":"a","sensor":"stap"})",
+       "unknown sensor \"stap\": `senseloom sensors` prints those that are known"},
+      {R"({"call":"set_option","option":{}})", "missing \"session\""},
+      {R"({"call":"set_option","session":"a"})", "missing \"option\""},
+      {R"({"call":"set_option","session":"a","option":[]})", "\"option\" must be an object, a string or null"},
+      {R"({"call":"set_option","session":"a","option":3})", "\"option\" must be an object, a string or null"},
+      {R"({"call":"set_option","session":"a","optionHex":"7"})",
+       "\"optionHex\" must hold hexadecimal digits, two a byte"},
+      {R"({"call":"set_option","session":"a","optionHex":7})", "\"optionHex\" must be a string"},
+      {R"({"call":"dispatch","record":{}})", "a dispatch needs either \"session\" or \"sensor\""},
+      {R"({"call":"dispatch","session":"a","sensor":"STAP","record":{}})",
+       "a dispatch needs either \"session\" or \"sensor\""},
+      {R"({"call":"dispatch","session":1,"record":{}})", "\"session\" must be a string"},
+      {R"({"call":"dispatch","sensor":"X","record":{}})",
+       "unknown sensor \"X\": `senseloom sensors` prints those that are known"},
+      {R"({"call":"dispatch","session":"a"})", "missing \"record\""},
+      {R"({"call":"dispatch","session":"a","record":"00"})", "\"record\" must be an object"},
+      {R"({"call":"close"})", "missing \"session\""},
+      {R"({"call":"close","session":{}})", "\"session\" must be a string"},
+  };
+  for (const auto& [line, message] : lines) EXPECT_EQ(errorOf(line), message) << line;
+}
+
+}  // namespace
+}  // namespace senseloom::tool
