@@ -74,7 +74,7 @@ bool activateAudio() {
     __android_log_print(ANDROID_LOG_DEBUG, kTag, "already activated, return");
     return true;
   }
-  AwareParameters parameters = kParameters;  // built anew each time, in memory that the device may write to
+  aware_parameters_t parameters = kParameters;  // built anew each time, in memory that the device may write to
   if (device == nullptr) return false;
   aware_hw_device* const opened = device;
   __android_log_print(ANDROID_LOG_DEBUG, kTag, "activating aware... %p\n", static_cast<void*>(opened));

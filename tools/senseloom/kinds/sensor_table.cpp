@@ -4,7 +4,7 @@
 #include <iterator>
 
 #include "input_error.h"
-#include "option/option_kinds.h"
+#include "option/all_options.h"
 
 namespace senseloom::tool {
 namespace {
@@ -39,10 +39,11 @@ constexpr bool isComplete(const Sensor& sensor) {
 static_assert(std::all_of(std::begin(kSensors), std::end(kSensors), isComplete), "a row of kSensors lacks a field");
 
 // Every kind of sensor that the library has is here, and no other.
-#define SENSOR_KIND(Kind) static_assert(find(Option##Kind::kind.sensor) != nullptr, #Kind " has no row in kSensors");
+#define SENSOR_KIND(SensorClass, SessionClass, OptionClass, BaseClass) \
+  static_assert(find(OptionClass::kind.sensor) != nullptr, #SensorClass " has no row in kSensors");
 #include "sensor_kinds.def"
 #undef SENSOR_KIND
-static_assert(std::size(kSensors) == std::size(kOptionKinds), "a row of kSensors is no sensor of the library");
+static_assert(std::size(kSensors) == std::size(kOptionDescriptions), "a row of kSensors is no sensor of the library");
 
 }  // namespace
 

@@ -63,7 +63,7 @@ def forget_row(rebuild, tree):
     try:
         rebuild.target("senseloom_cli")
     except CompileError as error:
-        expect("the compiler does not name the sensor", "Spin has no row in kSensors" in str(error), str(error))
+        expect("the compiler does not name the sensor", "ContextSensorSpin has no row in kSensors" in str(error), str(error))
     else:
         sys.exit("a sensor without its row compiles")
 
