@@ -17,9 +17,10 @@ class PageError(Exception):
 
 def blocks(page):
     """(kind of place, file, line to come after, code) of each block of the page."""
+    page = re.sub(r"<!--.*?-->", "", page, flags=re.DOTALL)
     parts = re.split(r"^```[^\n]*\n(.*?)^```$", page, flags=re.MULTILINE | re.DOTALL)
     for text, code in zip(parts[0::2], parts[1::2]):
-        # A sentence may be wrapped; the blanks within backquotes count.
+        # The sentence may be wrapped.
         sentence = re.sub(r"\n(?=[^\n])", " ", text.rstrip())
         found = [(kind, pattern.search(sentence)) for kind, pattern in PLACES]
         found = [(kind, match) for kind, match in found if match]
@@ -40,13 +41,12 @@ def apply(page, tree):
             file.parent.mkdir(parents=True, exist_ok=True)
             content = code
         else:
-            content = file.read_text()
-            if kind == "end":
-                content += code
-            elif content.count(line + "\n") != 1:
+            lines = file.read_text().splitlines(keepends=True)
+            places = [number for number, there in enumerate(lines) if there.strip() == line]
+            if kind == "after" and len(places) != 1:
                 raise PageError(f"{name} has no single line {line!r}")
-            else:
-                content = content.replace(line + "\n", line + "\n" + code)
+            lines.insert(places[0] + 1 if kind == "after" else len(lines), code)
+            content = "".join(lines)
         file.write_text(content)
         changed.append(file)
     return changed
