@@ -58,7 +58,8 @@ class Rebuild:
                        f"{self.tree}/", command)
         moved = re.sub(r" -MD -MT \S+ -MF \S+", "", moved)
         arguments = [str(made) if argument == name else argument for argument in shlex.split(moved)]
-        self._run([*arguments, "-O0", "-U_FORTIFY_SOURCE"])
+        plain = ["-O0"] + (["-U_FORTIFY_SOURCE"] if "_FORTIFY_SOURCE" in command else [])  # which takes optimisation
+        self._run([*arguments, *plain])
         self.remade[name] = str(made)
 
     def _link(self, command, name, archives):
