@@ -55,13 +55,12 @@ def use(tool, cases, picture):
     expect("explain does not know who decided", "minimum" in reasons and "unexplained" not in reasons, reasons)
 
 
-def forget_row(rebuild, tree):
+def forget_row(table, compile_table):
     """Without its row in the tool's table, the sensor is an error that names it."""
-    table = pathlib.Path(tree, "tools/senseloom/kinds/sensor_table.cpp")
     rows = table.read_text().splitlines(keepends=True)
     table.write_text("".join(row for row in rows if "SPIN" not in row))
     try:
-        rebuild.target("senseloom_cli")
+        compile_table()
     except CompileError as error:
         expect("the compiler does not name the sensor", "ContextSensorSpin has no row in kSensors" in str(error), str(error))
     else:
@@ -75,15 +74,13 @@ def main():
     for folder in FOLDERS:
         shutil.copytree(os.path.join(root, folder), os.path.join(tree, folder))
     changed = apply(pathlib.Path(root, "docs/adding-a-sensor.md").read_text(), tree)
-
-    def rebuilding(folder):
-        return Rebuild(build, root, tree, changed, os.path.join(output, folder))
-
-    rebuild = rebuilding("build")
-    tool = rebuild.target("senseloom_cli")
+    tool = Rebuild(build, root, tree, changed, os.path.join(output, "build")).target("senseloom_cli")
     os.environ["LD_LIBRARY_PATH"] = f"{output}/build/lib:{build}/lib"
     use(tool, os.path.join(tree, "tests/cases/spin.jsonl"), os.path.join(output, "spin.svg"))
-    forget_row(rebuilding("build_without_row"), tree)
+
+    table = pathlib.Path(tree, "tools/senseloom/kinds/sensor_table.cpp")
+    without_row = Rebuild(build, root, tree, [table], os.path.join(output, "build_without_row"))
+    forget_row(table, lambda: without_row.target("senseloom_cli"))
 
 
 main()
