@@ -11,7 +11,7 @@
 #include <vector>
 
 #include "client.h"
-#include "sensors/option_data.h"
+#include "kinds/option_data.h"
 #include "trace/hex.h"
 #include "trace/record_codec.h"
 
