@@ -7,6 +7,7 @@
 #include <cstdio>
 #include <cstring>
 
+#include "audio/hardware_layout.h"
 #include "senseloom.h"
 
 // Every call of the platform, and the log is one, may clear what callers see, too: it is read anew after each.
