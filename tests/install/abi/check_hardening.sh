@@ -1,11 +1,15 @@
 #!/usr/bin/env bash
-# check_hardening.sh READELF LIBRARY: what keeps a mistake in the library from becoming more than one.
+# What keeps a mistake in the library from becoming more than one: check_hardening.sh READELF LIBRARY FOLDER
+#
+# FOLDER: of the objects that the library was linked from.
 set -euo pipefail
 readelf=$1
 library=$2
+mapfile -t objects < <(find "$3" -name '*.o')
 segments=$("$readelf" --wide --program-headers "$library")
 dynamic=$("$readelf" --wide --dynamic "$library")
-symbols=$("$readelf" --wide --dyn-syms "$library" | awk '$7 == "UND" {print $8}')
+imports=$("$readelf" --wide --dyn-syms "$library" | awk '$7 == "UND" {print $8}')
+used=$("$readelf" --wide --symbols "${objects[@]}" | awk '$7 == "UND" {print $8}')
 
 failed=0
 # require TEXT PATTERN MESSAGE
@@ -28,8 +32,9 @@ require "$dynamic" 'BIND_NOW|Flags:.* NOW' "functions are looked up when they ar
 forbid "$dynamic" 'TEXTREL' "the code is written to at loading"
 require "$segments" 'GNU_STACK .* RW  ' "the stack can be executed"
 forbid "$segments" 'LOAD .* RWE ' "memory can be written and executed"
-require "$symbols" '^__stack_chk_fail' "functions with arrays do not guard their stack frames"
-# With _FORTIFY_SOURCE those that write to memory of known size are the __..._chk ones.
-forbid "$symbols" '^(strcpy|stpcpy|strcat|strncat|sprintf|vsprintf|snprintf|vsnprintf|gets|fgets|read|recv)(@|$)' \
+require "$imports" '^__stack_chk_fail' "functions with arrays do not guard their stack frames"
+# With _FORTIFY_SOURCE those that write to memory of known size are the __..._chk ones. What archives bring into the
+# library was compiled by others, so the library's own objects are looked at.
+forbid "$used" '^(strcpy|stpcpy|strcat|strncat|sprintf|vsprintf|snprintf|vsnprintf|gets|fgets|read|recv)(@|$)' \
   "functions that write without a check"
 exit $failed
