@@ -282,9 +282,11 @@ TEST(Allocations, AreWatchedWhicheverWayTheyAreMade) {
   const memory::AllocationCount allocations;
   const auto object = std::make_unique<uint64_t>();
   const auto array = std::make_unique<uint64_t[]>(3);
+  const std::unique_ptr<uint64_t> other(new (std::nothrow) uint64_t);
+  const std::unique_ptr<uint64_t[]> others(new (std::nothrow) uint64_t[3]);
   std::free(std::realloc(std::malloc(4), 400));
   std::free(std::calloc(4, 4));
-  EXPECT_EQ(allocations.made(), 5);
+  EXPECT_EQ(allocations.made(), 7);
   const memory::FailingAllocation second(2);
   std::free(std::malloc(4));
   EXPECT_FALSE(second.happened());

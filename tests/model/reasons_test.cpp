@@ -58,7 +58,7 @@ class Reasons : public testing::Test {
     items += outcome.why.items;
     return outcome.why.verdict.text();
   }
-  // Records with a little-endian value of that many bytes at byte 8.
+  // Records with a little-endian value of up to 8 bytes at byte 8.
   static Bytes valued(int64_t value, size_t size, uint8_t timestamp = 1) {
     Bytes record(8 + size);
     record[0] = timestamp;
@@ -220,7 +220,8 @@ TEST_F(Reasons, CountGatheredItems) {
 TEST_F(Reasons, TellWhetherAGestureWasRecognised) {
   const void* letters = open(gspx);
   set(letters, R"({"classMask":1024})");
-  Bytes samples = valued(0, 16);
+  Bytes samples(24);
+  samples[0] = 1;
   EXPECT_EQ(judged(letters, samples), "no gesture recognised");
   model.answers.names = {"LetterB "};
   samples[0] = 2;

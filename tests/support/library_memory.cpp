@@ -76,8 +76,12 @@ void forget(void* block) {
   liveBlocks().erase(found);
 }
 
+void* newBlockOrNull(size_t size) {
+  return watched(size, [=] { return __real_malloc(size != 0 ? size : 1); });
+}
+
 void* newBlock(size_t size) {
-  void* block = watched(size, [=] { return __real_malloc(size != 0 ? size : 1); });
+  void* block = newBlockOrNull(size);
   if (block == nullptr) throw std::bad_alloc();
   return block;
 }
@@ -135,6 +139,13 @@ void* operator new(size_t size) {
 }
 void* operator new[](size_t size) {
   return newBlock(size);
+}
+// A sanitizer would have its own of these.
+void* operator new(size_t size, const std::nothrow_t&) noexcept {
+  return newBlockOrNull(size);
+}
+void* operator new[](size_t size, const std::nothrow_t&) noexcept {
+  return newBlockOrNull(size);
 }
 void operator delete(void* block) noexcept {
   std::free(block);
