@@ -3,6 +3,7 @@
 #include <jansson.h>
 #include <senseloom.h>
 
+#include <algorithm>
 #include <cstdint>
 #include <cstdlib>
 #include <functional>
@@ -48,6 +49,7 @@ int exempt = 0;  // objects of Exempt
 
 size_t until_failure = 0;  // allocations left, the one that fails included; 0: none fails
 bool fails_for_ever = false;
+size_t most_bytes = SIZE_MAX;
 bool has_failed = false;
 
 // Makes an allocation of the library, or lets it fail.
@@ -61,6 +63,10 @@ void* watched(size_t size, const Allocate& allocate) {
     return nullptr;
   }
   if (until_failure > 1) --until_failure;
+  if (size > most_bytes - std::min(most_bytes, live_bytes)) {
+    has_failed = true;
+    return nullptr;
+  }
   void* block = allocate();
   if (block == nullptr) return nullptr;
   liveBlocks()[block] = size;
@@ -96,8 +102,14 @@ void failAt(size_t which, bool forEver) {
   has_failed = false;
 }
 
+void failAbove(size_t bytes) {
+  most_bytes = bytes;
+  has_failed = false;
+}
+
 bool stopFailing() {
   until_failure = 0;
+  most_bytes = SIZE_MAX;
   return has_failed;
 }
 

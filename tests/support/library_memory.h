@@ -9,6 +9,8 @@ namespace memory {
 
 // Lets the allocation `which` of those to come fail, from 1; with `forEver` all later ones, too.
 void failAt(size_t which, bool forEver);
+// Lets each allocation fail that would leave the library with more than so many bytes.
+void failAbove(size_t bytes);
 // Lets no more fail. Returns whether any did.
 bool stopFailing();
 bool hasFailed();
