@@ -2,10 +2,12 @@
 // sessions. One build of it is linked with the library, the other loads it from the path in the second argument.
 
 #include <sys/mman.h>
+#include <sys/prctl.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <atomic>
+#include <csignal>
 #include <cstdint>
 #include <cstring>
 #include <iterator>
@@ -139,6 +141,7 @@ int main(int argc, char** argv) {
     REQUIRE(*done);
     return 0;
   }
+  prctl(PR_SET_PDEATHSIG, SIGKILL);  // whoever waits may lose patience
   scenario = argv[1];
   runService(argv[argc - 1]);
 }
