@@ -1,12 +1,15 @@
 #include <gtest/gtest.h>
 
+#include <array>
 #include <limits>
 #include <string>
 #include <vector>
 
+#include "bytes.h"
 #include "proc/proc_change.h"
 #include "proc/proc_mask.h"
 #include "proc/proc_mixer.h"
+#include "proc/proc_mixer_activity.h"
 #include "proc/proc_mixer_pedo.h"
 #include "proc/proc_nm.h"
 
@@ -241,6 +244,41 @@ TEST(PedoMixer, KeepsTheMostRecentCountOfABatch) {
   EXPECT_FALSE(stage.accept(counts, 2));
   EXPECT_TRUE(stage.accept(counts + 2, 1));
   EXPECT_EQ(loadI32({stage.buffer(), 4}, 0), 0x01020304);
+}
+
+// A stage that completes with fewer elements than it has room for.
+template <class Element, int kLength>
+struct ShortStage {
+  static constexpr size_t kElementSize = sizeof(Element);
+
+  static bool accept(const void*, int) { return true; }
+  const uint8_t* buffer() const { return reinterpret_cast<const uint8_t*>(elements.data()); }
+  static int length() { return kLength; }
+  static int bufferLength() { return 3; }
+
+  std::array<Element, 3> elements;
+};
+
+TEST(PedoMixer, KeepsTheLastCountThatThereIs) {
+  using Stage = ShortStage<int32_t, 2>;
+  ProcMixerPedo<Stage> stage(Stage{{7, 8, 9}}, {});
+  EXPECT_TRUE(stage.accept("data", 1));
+  EXPECT_EQ(loadI32({stage.buffer(), 4}, 0), 8);
+}
+
+TEST(ActivityMixer, CountsAllTheRoomOfTheStageBefore) {
+  using Stage = ShortStage<uint16_t, 2>;
+  ProcMixerActivity<Stage> stage(Stage{{0x51, 0x62, 0x72}}, ActivityVote(-1));
+  EXPECT_TRUE(stage.accept("data", 1));
+  EXPECT_EQ(loadU16({stage.buffer(), 2}, 0), 0x52)
+      << "two of three; of the first two alone no class has more than half";
+}
+
+TEST(ActivityMixer, OverAStageWithoutRoomHasNoResult) {
+  ProcMixerActivity<ProcNM<2>> stage;
+  const uint16_t decision = 0x51;
+  EXPECT_FALSE(stage.accept(&decision, 1));
+  EXPECT_EQ(stage.length(), 0);
 }
 
 }  // namespace
