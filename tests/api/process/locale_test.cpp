@@ -14,12 +14,11 @@ constexpr const char* kLocale = "ps_AF.UTF-8";
 class ManyByteDecimalPoint : public ::testing::TestWithParam<bool> {
  protected:
   void SetUp() override {
+    ASSERT_NE(std::setlocale(LC_ALL, kLocale), nullptr) << "no " << kLocale << " in LOCPATH";
     if (GetParam()) {
-      own = newlocale(LC_ALL_MASK, kLocale, nullptr);
-      ASSERT_NE(own, nullptr) << "no " << kLocale << " in LOCPATH";
+      own = duplocale(LC_GLOBAL_LOCALE);
+      std::setlocale(LC_ALL, "C");
       uselocale(own);
-    } else {
-      ASSERT_NE(std::setlocale(LC_ALL, kLocale), nullptr) << "no " << kLocale << " in LOCPATH";
     }
     ASSERT_GT(std::strlen(localeconv()->decimal_point), 1U);
   }

@@ -69,8 +69,8 @@ void useAndClose() {
   for (int i = 0; i < sessions; ++i) {
     ctx_option_t* list = nullptr;
     REQUIRE(library.close(handles[i], &list) >= 0);
-    REQUIRE(library.close(handles[i], &list) == -1);
     library.release(list);
+    REQUIRE(library.close(handles[i], &list) == -1);
   }
   library.uninit();
   *done = true;

@@ -53,6 +53,9 @@ void* operator new(size_t size) {
 void* operator new[](size_t size) {
   return allocate(size);
 }
+void* operator new[](size_t size, const std::nothrow_t&) noexcept {
+  return allocate(size);
+}
 void operator delete(void* block) noexcept {
   release(block);
 }
