@@ -42,7 +42,7 @@ TEST(Arguments, OfADispatchThatAreWrongInAnyCombinationAreRefusedBeforeTheSensor
 }
 
 TEST(Arguments, OfAClosingThatAreWrongAreRefusedBeforeAnythingIsStoredOrMade) {
-  ctx_option_t somewhere{};
+  static ctx_option_t somewhere;
   ctx_option_t* list = &somewhere;
   EXPECT_EQ(ctx_close_session(nullptr, &list), -1);
   EXPECT_EQ(ctx_close_session(nullptr, nullptr), -1);
@@ -56,7 +56,7 @@ TEST(Arguments, OfAClosingThatAreWrongAreRefusedBeforeAnythingIsStoredOrMade) {
 
 TEST(Arguments, OfAnOptionThatAreWrongInAnyCombinationAreRefusedBeforeAnythingIsStoredOrMade) {
   char handle[64] = {};
-  ctx_option_t somewhere{};
+  static ctx_option_t somewhere;
   for (int wrong = 1; wrong < 8; ++wrong) {
     ctx_option_t* list = &somewhere;
     EXPECT_EQ(ctx_set_option((wrong & 1) != 0 ? nullptr : handle, 0, (wrong & 2) != 0 ? nullptr : "not JSON",
