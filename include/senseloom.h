@@ -86,8 +86,8 @@ SENSELOOM_API void *ctx_open_session(const char *sensor) SENSELOOM_NOEXCEPT;
  * Returns 0, with the sensor's new property list in `*out`, for the caller to release; or -1: for a NULL handle, option
  * or out (nothing is written then), an unknown handle, an option string that is not JSON or is refused by the sensor
  * (the sensor stays as it was), or merged options that exclude each other. `*out` is NULL then. When a session could
- * not start over the result is -1, too, but `*out` holds the new list. A string for which there is not enough memory
- * counts as one that is not JSON. "ISACT" and "SCOUN" accept a string that is not JSON, and their option stays as it was.
+ * not start over the result is -1, too, but `*out` holds the new list. "ISACT" and "SCOUN" accept a string that is not
+ * JSON, and their option stays as it was.
  *
  * A value out of range fails the call for "DTWGS" alone. For the other sensors it becomes the default, another fixed
  * value or the nearest bound, or is kept while the class mask is emptied; only some of these are logged.

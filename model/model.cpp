@@ -34,6 +34,7 @@ Outcome Model::setOption(const void* handle, const char* text, bool hasOut) {
   if (!prepare()) return std::exchange(outcome, {});
   Session* found = session(handle);
   if (found == nullptr) return std::exchange(outcome, {});
+  if (shortage.room) return std::exchange(outcome, {});
   const ReadingPlace place{templates, outcome.log, explains ? &outcome.why.remarks : nullptr};
   if (!readOption(found->request, text, !shortage.text, place)) return std::exchange(outcome, {});
   if (mistake == Mistake::optionDropsPendingItems) found->gathering.drop();

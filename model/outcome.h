@@ -27,7 +27,8 @@ struct Answers {
 };
 
 // Which allocations of a call fail; `rebuild` has a bit for each session of the sensor, in opening order. Room is what
-// is needed before a sensor is started, be it for twelve new sensors or for one session more.
+// is needed before anything is begun: for twelve new sensors, for one session more, or for reading an option string. A
+// text that runs out of memory in the middle all the same counts as text that is not JSON.
 struct Shortage {
   bool room = false;
   bool session = false;

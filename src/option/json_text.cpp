@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <cstring>
 #include <limits>
+#include <new>
 
 namespace senseloom {
 namespace {
@@ -12,44 +13,45 @@ namespace {
 // jansson drops a byte, writes beyond its buffer or aborts when its memory runs out in the middle of a token, so it
 // only starts when there is enough for all of the text. Nested arrays take the most, 16 pointers a character on 64 bits
 // and 20 on 32, the heap's own use included.
-bool hasMemoryToRead(const char* text) {
+void requireMemoryToRead(const char* text) {
   constexpr size_t kBytesPerCharacter = 24 * sizeof(void*);
   constexpr size_t kLeastBytes = 1024;
   const size_t length = std::strlen(text);
-  if (length > (std::numeric_limits<size_t>::max() - kLeastBytes) / kBytesPerCharacter) return false;
+  if (length > (std::numeric_limits<size_t>::max() - kLeastBytes) / kBytesPerCharacter) throw std::bad_alloc();
   json_malloc_t take = nullptr;
   json_free_t giveBack = nullptr;
   json_get_alloc_funcs(&take, &giveBack);
   void* const memory = take(kLeastBytes + kBytesPerCharacter * length);
+  if (memory == nullptr) throw std::bad_alloc();
   giveBack(memory);
-  return memory != nullptr;
 }
 
 // Puts the calling thread into the "C" locale: jansson aborts where a decimal point has several bytes.
 class CLocale {
  public:
-  CLocale() : own(newlocale(LC_ALL_MASK, "C", nullptr)), before(own != nullptr ? uselocale(own) : nullptr) {}
+  CLocale() : own(newlocale(LC_ALL_MASK, "C", nullptr)) {
+    if (own == nullptr) throw std::bad_alloc();
+    before = uselocale(own);
+  }
   ~CLocale() {
-    if (own == nullptr) return;
     uselocale(before);
     freelocale(own);
   }
   CLocale(const CLocale&) = delete;
   CLocale& operator=(const CLocale&) = delete;
 
-  bool isInForce() const { return own != nullptr; }
-
  private:
   const locale_t own;
-  const locale_t before;
+  locale_t before;
 };
 
 }  // namespace
 
 JsonRoot readJson(const char* text) {
-  if (text == nullptr || !hasMemoryToRead(text)) return nullptr;
+  if (text == nullptr) return nullptr;
+  requireMemoryToRead(text);
   const CLocale locale;
-  return JsonRoot(locale.isInForce() ? json_loads(text, 0, nullptr) : nullptr);
+  return JsonRoot(json_loads(text, 0, nullptr));
 }
 
 }  // namespace senseloom

@@ -109,6 +109,8 @@ std::vector<OptionCase> cases() {
   std::vector<OptionCase> all = {
       {"STAP", R"({"classMask":1})", integers({1, 0}), R"({"client":"navigation-app","classMask":2,"level":-1})",
        integers({2, -1})},
+      {"ISACT", R"({"classMask":1})", integers({1}), R"({"client":"navigation-app","classMask":2})", integers({2})},
+      {"SCOUN", R"({"mode":0})", integers({0, 1}), R"({"client":"navigation-app","logN":7})", integers({1, 7})},
       {"DTWGS",
        R"({"mode":4,"classMask":1,"template1":"0001ee"})",
        {0, 0, 0, 0, 0, 0, 0, 0, 0xEE},  // level, number and data of the template

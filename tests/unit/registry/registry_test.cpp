@@ -7,10 +7,10 @@
 #include <set>
 #include <string>
 
-#include "library_memory.h"
 #include "fake_option.h"
 #include "fake_platform.h"
 #include "fake_session.h"
+#include "library_memory.h"
 
 // Each of these tests needs a fresh process, in which no sensor was ever made.
 namespace senseloom {

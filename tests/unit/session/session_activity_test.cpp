@@ -3,7 +3,7 @@
 #include <gtest/gtest.h>
 
 #include "bytes_of.h"
-#include "session/context_sensor.h"
+#include "registry/registry.h"
 
 namespace senseloom {
 namespace {
@@ -35,6 +35,9 @@ TEST(ActivityCallbacks, MaskClearsClassesWhoseBitIsNotSet) {
 // A session alone, on a sensor that nothing was negotiated on.
 class Activity : public testing::Test {
  protected:
+  Activity() { _init_senseloom(); }
+  ~Activity() override { deleteSensors(); }
+
   static int deliver(Session& session, Bytes record, Bytes* result = nullptr) {
     void* out = nullptr;
     int length = 0;
