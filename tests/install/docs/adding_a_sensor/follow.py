@@ -10,7 +10,7 @@ import sys
 from page import apply
 from rebuild import CompileError, Rebuild
 
-FOLDERS = ["include", "model", "platform", "src", "tests", "tools"]
+FOLDERS = ["fuzz", "include", "model", "platform", "src", "tests", "tools"]
 
 SENSOR = """\
 SPIN: spin
@@ -37,22 +37,24 @@ def expect(what, holds, text):
         sys.exit(f"{what}:\n{text}")
 
 
+def run(program, *arguments):
+    done = subprocess.run([program, *arguments], capture_output=True, text=True)
+    expect(f"{program} {' '.join(arguments)} failed", done.returncode == 0, done.stdout + done.stderr)
+    return done.stdout
+
+
 def use(tool, cases, picture):
     """Runs every command of the tool that knows the sensor."""
-
-    def run(*arguments):
-        done = subprocess.run([tool, *arguments], capture_output=True, text=True)
-        expect(f"senseloom {' '.join(arguments)} failed", done.returncode == 0, done.stdout + done.stderr)
-        return done.stdout
-
-    shown = run("sensors", "SPIN")
+    shown = run(tool, "sensors", "SPIN")
     expect("sensors prints something else", shown == SENSOR, shown)
-    received = run("replay", "--all", "--plot", picture, cases)
+    received = run(tool, "replay", "--all", "--plot", picture, cases)
     expect("replay prints something else", received == RECEIVED, received)
     drawn = pathlib.Path(picture).read_text()
     expect("the picture does not show the class", "SPIN" in drawn and "class 3" in drawn, drawn)
-    reasons = run("explain", "SPIN", '{"speed":7}', '{"speed":4,"classMask":16}')
+    reasons = run(tool, "explain", "SPIN", '{"speed":7}', '{"speed":4,"classMask":16}')
     expect("explain does not know who decided", "minimum" in reasons and "unexplained" not in reasons, reasons)
+    reasons = run(tool, "explain", "--records", cases)
+    expect("explain does not know why", "class not wanted: bits 4, mask 3" in reasons and "unexplained" not in reasons, reasons)
 
 
 def forget_row(table, compile_table):
@@ -74,9 +76,14 @@ def main():
     for folder in FOLDERS:
         shutil.copytree(os.path.join(root, folder), os.path.join(tree, folder))
     changed = apply(pathlib.Path(root, "docs/adding-a-sensor.md").read_text(), tree)
-    tool = Rebuild(build, root, tree, changed, os.path.join(output, "build")).target("senseloom_cli")
+    cases = os.path.join(tree, "tests/cases/spin.jsonl")
+    rebuild = Rebuild(build, root, tree, changed, os.path.join(output, "build"))
+    tool = rebuild.target("senseloom_cli")
     os.environ["LD_LIBRARY_PATH"] = f"{output}/build/lib:{build}/lib"
-    use(tool, os.path.join(tree, "tests/cases/spin.jsonl"), os.path.join(output, "spin.svg"))
+    use(tool, cases, os.path.join(output, "spin.svg"))
+    run(rebuild.target("case_runner"), cases)
+    run(rebuild.target("unit_test"), "--gtest_filter=*Contract*")
+    run(rebuild.target("allocation_failure_test"), "--gtest_filter=*/SPIN")
 
     table = pathlib.Path(tree, "tools/senseloom/kinds/sensor_table.cpp")
     without_row = Rebuild(build, root, tree, [table], os.path.join(output, "build_without_row"))

@@ -1,5 +1,6 @@
 """Builds targets from changed sources, out of the objects of a build with Ninja wherever the change leaves them alone."""
 
+import concurrent.futures
 import os
 import pathlib
 import re
@@ -35,17 +36,23 @@ class Rebuild:
     def target(self, name):
         """Makes a target and whatever it consists of. Returns its file."""
         archives = {}
+        compiling = {}
+        links = []
         made = None
         for command in self._ninja("-t", "commands", name).splitlines():
             compiled = re.search(r" -o (\S+\.o) -c ", command)
             archived = re.search(r" qc (\S+\.a) +(.*\.o)( |$)", command)
             linked = re.search(r" -o (\S+) ", command)
             if compiled:
-                self._compile(command, compiled[1])
+                compiling[compiled[1]] = command
             elif archived:
                 archives[archived[1]] = archived[2].split()
             elif linked:
-                made = self._link(command, linked[1], archives) or made
+                links.append((command, linked[1]))
+        with concurrent.futures.ThreadPoolExecutor(os.cpu_count()) as pool:
+            list(pool.map(self._compile, compiling.values(), compiling.keys()))
+        for command, file in links:
+            made = self._link(command, file, archives) or made
         return made
 
     def _compile(self, command, name):
@@ -54,8 +61,8 @@ class Rebuild:
         made = self.output / name
         made.parent.mkdir(parents=True, exist_ok=True)
         # What was generated into the build's folder stays where it is.
-        moved = re.sub(rf"{re.escape(self.root)}/(?!{re.escape(os.path.relpath(self.build, self.root))}/)",
-                       f"{self.tree}/", command)
+        moved = re.sub(rf"{re.escape(self.root)}(?=[/ ])(?!/{re.escape(os.path.relpath(self.build, self.root))}/)",
+                       self.tree, command)
         moved = re.sub(r" -MD -MT \S+ -MF \S+", "", moved)
         arguments = [str(made) if argument == name else argument for argument in shlex.split(moved)]
         plain = ["-O0"] + (["-U_FORTIFY_SOURCE"] if "_FORTIFY_SOURCE" in command else [])  # which takes optimisation
