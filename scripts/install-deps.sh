@@ -8,7 +8,7 @@ set -euo pipefail
 # Per task: packages that are programs or headers, and libraries, which 32-bit x86 needs in its own version, too.
 declare -A programs=(
   [build]="g++ cmake ninja-build libcli11-dev"
-  [test]="abigail-tools binutils clang clang-13 doxygen dpkg-dev file groff-base libc++-dev libc++abi-dev lld locales pkg-config python3 valgrind"
+  [test]="abigail-tools binutils clang clang-13 doxygen dpkg-dev file groff-base libc++-dev libc++abi-dev lld locales pkg-config python3 python3-numpy valgrind"
   [bench]="libboost-dev librange-v3-dev"
   [fuzz]="clang libclang-rt-14-dev" # brings the runtime libraries of both word sizes
   [coverage]="clang libclang-rt-14-dev llvm"

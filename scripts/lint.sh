@@ -14,6 +14,6 @@ printf '%s\0' "${library[@]}" | xargs -0 -n 1 -P "$(nproc)" clang-tidy -p "$buil
 cppcheck --quiet --error-exitcode=1 --std=c++20 --language=c++ --enable=warning,performance,portability \
   --suppress=syntaxError:src/api/session_api.cpp -I include -I src "${library[@]}"
 # "opton" is a text of the library, letter for letter; some tests mistype on purpose.
-codespell --ignore-words-list=opton,inout,stap,allone,opne,levle --skip='./build,./.git,./fuzz/corpus,*.svg,*.jsonl,LICENSE' .
+codespell --ignore-words-list=opton,inout,stap,allone,opne,levle --skip='./build,./.git,./fuzz/corpus,*.svg,*.jsonl,LICENSE,*templates.inc' .
 shellcheck "${scripts[@]}"
 echo "lint: clean"

@@ -1,6 +1,7 @@
 #include <gesture.h>
 #include <gtest/gtest.h>
 
+#include <cstddef>
 #include <cstdint>
 #include <cstdio>
 #include <fstream>
@@ -9,6 +10,7 @@
 #include <string>
 #include <vector>
 
+#include "gesture/drawings.h"
 #include "support.h"
 
 namespace {
@@ -31,6 +33,17 @@ class GestureEngine : public ::testing::Test {
     // The caller's way of releasing a name; the leak check sees one that is not.
     const std::unique_ptr<char[]> name(gesture_process_single_data(kGroup, 1, last));
     return name ? Name(name.get()) : kNone;
+  }
+
+  // The name at the last group; there is none before.
+  static Name feedDrawing(const Record& record) {
+    Name name;
+    for (std::size_t i = 0; i < record.size(); ++i) {
+      EXPECT_EQ(name, kNone);
+      const std::unique_ptr<char[]> found(gesture_process_single_data(record[i].data(), 1, i + 1 == record.size()));
+      if (found) name = found.get();
+    }
+    return name;
   }
 
   // The names of so many records of one group.
@@ -142,12 +155,33 @@ TEST_F(GestureEngine, ForgetsItsScriptWhenItDoesNotStartAgain) {
   EXPECT_EQ(feed(true), kNone);
 }
 
-TEST_F(GestureEngine, StartsWithoutAScriptAndRecognisesNothing) {
+TEST_F(GestureEngine, RecognisesDigitsWithoutAScript) {
+  const auto drawings = drawingsOf(7);
   for (const char* const none : {static_cast<const char*>(nullptr), ""}) {
     const ScopedVariable unset("SENSELOOM_GESTURE_SCRIPT", none);
-    EXPECT_TRUE(gesture_initial(0, 0));
-    EXPECT_EQ(feed(true), kNone);
+    ASSERT_TRUE(gesture_initial(0, 0));
+    EXPECT_EQ(feedDrawing(drawings[0]), "NumberSeven ");
+    EXPECT_EQ(feed(true), kNone);  // a record of one group
+    EXPECT_EQ(feedDrawing(drawings[1]), "NumberSeven ");
   }
+}
+
+TEST_F(GestureEngine, ForgetsTheBeginningOfARecordWhenItStartsAgain) {
+  const auto drawings = drawingsOf(4);
+  const ScopedVariable unset("SENSELOOM_GESTURE_SCRIPT", nullptr);
+  ASSERT_TRUE(gesture_initial(0, 0));
+  for (int i = 0; i < 100; ++i) EXPECT_EQ(feed(false), kNone);
+  ASSERT_TRUE(gesture_initial(0, 0));
+  EXPECT_EQ(feedDrawing(drawings[0]), "NumberFour ");
+}
+
+TEST_F(GestureEngine, RecognisesNoDigitBeforeItsStartAndAfterItsClose) {
+  const auto drawings = drawingsOf(4);
+  const ScopedVariable unset("SENSELOOM_GESTURE_SCRIPT", nullptr);
+  EXPECT_EQ(feedDrawing(drawings[0]), kNone);
+  ASSERT_TRUE(gesture_initial(0, 0));
+  gesture_close();
+  EXPECT_EQ(feedDrawing(drawings[0]), kNone);
 }
 
 }  // namespace
