@@ -7,14 +7,15 @@
 #include <cstdio>
 #include <cstdlib>
 
-// What every fuzz target does with an input: it becomes a sequence of calls, and the library has to do in them what the
-// model says.
+// What fuzz targets do with an input. Those of the library make it a sequence of calls, in which the library has to do
+// what the model says.
 namespace fuzz {
 
 // The targets. A build of one as a fuzzer names it in FUZZ_TARGET.
 void options(const uint8_t* data, size_t size);
 void records(const uint8_t* data, size_t size);
 void sequences(const uint8_t* data, size_t size);
+void gesture(const uint8_t* data, size_t size);
 
 inline oracle::Call openCall(int session, int sensor) {
   oracle::Call call;
