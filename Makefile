@@ -2,7 +2,7 @@
 SHELL := /bin/bash
 
 .DEFAULT_GOAL := demo
-.PHONY: demo test bench bench-count fuzz coverage memcheck mutants lint
+.PHONY: demo test accuracy bench bench-count fuzz coverage memcheck mutants lint
 .SILENT:
 
 # $(call build,PRESET,CMAKE ARGUMENTS,TARGET): quietly, unless it fails.
@@ -26,6 +26,14 @@ test:
 	  $(call build,$$preset,-DBUILD_TESTING=ON); \
 	  ctest --preset $$preset || exit 1; \
 	done
+
+# Prints how well digits are recognised that were not learned from; of the recordings in DATA, a folder laid out as data/.
+DATA := data
+accuracy:
+	$(call install,build test)
+	read -r preset _ <<<"$$(scripts/host-presets.sh x86 native)"; \
+	$(call build,$$preset,-DBUILD_TESTING=ON,accuracy_recognise) && \
+	tests/accuracy/digits.py build/$$preset $(DATA)
 
 # Times the library beside what one would write instead, and prints ratios.
 bench:
