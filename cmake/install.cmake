@@ -24,7 +24,7 @@ set_target_properties(senseloom senseloom_cli senseloom_trace hardware aware_pri
 
 install(TARGETS senseloom LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT library NAMELINK_COMPONENT development)
 install(TARGETS hardware aware_primary gesture LIBRARY DESTINATION ${platform_dir} COMPONENT library)
-install(FILES LICENSE TYPE DOC COMPONENT library)
+install(FILES LICENSE data/NOTICE TYPE DOC COMPONENT library) # the latter: what the gesture engine learned from
 
 install(FILES include/senseloom.h include/senseloom.hpp TYPE INCLUDE COMPONENT development)
 install(FILES docs/man/libsenseloom.3 DESTINATION ${CMAKE_INSTALL_MANDIR}/man3 COMPONENT development)
