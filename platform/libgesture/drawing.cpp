@@ -30,7 +30,7 @@ std::int64_t angularRate(const Group& group) {
 // The record without the still groups at both ends: those that turn, smoothed over five, at less than a twentieth of
 // the rate that 95 % of the groups stay below. The first and last groups count twice and thrice at the ends.
 std::span<const Group> movingPart(std::span<const Group> record) {
-  std::array<std::int64_t, kMostGroups> motion;
+  std::array<std::int64_t, kMostGroups> motion{};
   const auto last = static_cast<std::ptrdiff_t>(record.size()) - 1;
   for (std::ptrdiff_t i = 0; i <= last; ++i) {
     std::int64_t sum = 0;
@@ -113,7 +113,7 @@ std::optional<Drawing> describe(std::span<const Group> record) {
 Points mirrored(const Points& points) {
   Points result = points;
   for (Point& point : result) {
-    for (const std::size_t axis : {0, 4, 5}) point[axis] = static_cast<std::int8_t>(-point[axis]);
+    for (const std::size_t axis : {0U, 4U, 5U}) point[axis] = static_cast<std::int8_t>(-point[axis]);
   }
   return result;
 }
