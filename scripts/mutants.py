@@ -12,9 +12,9 @@ A mutant is named by its file, the changed line as it is, and as it becomes; by 
 
 A mutant is built like the product for the host's word size, with the C++ library's checks of bounds on top. When the
 shared library comes out the same to the byte, no test could tell, and the mutant does not count; neither does one that
-does not compile, nor one that is listed, with its reason, in mutants-equivalent.txt. The others are killed by any test of behaviour that fails, crashes or does not end:
-the cases and the tests of tests/api first, which need no linking, then those of the file's folder, then the rest. Nothing is random:
-addresses and the seed of the tests are fixed.
+does not compile, nor one that is listed, with its reason, in mutants-equivalent.txt. The others are killed by any test
+of behaviour that fails, crashes or does not end: first by what runs on the shared library and so needs no linking, with
+what killed the last mutant of the file at the front. Nothing is random: addresses and the seed of the tests are fixed.
 """
 
 import argparse
@@ -219,35 +219,28 @@ target_precompile_headers(senseloom_objects PRIVATE <algorithm> <array> <cstring
 
 
 def adapted(file, text):
-    """The text of a file for a build that takes less time: all tests use one precompiled header."""
-    if file == "src/CMakeLists.txt":
-        return text + OF_THE_LIBRARY
-    if file == "tests/CMakeLists.txt":
-        return "add_compile_options($<$<COMPILE_LANGUAGE:CXX>:-fno-rtti>)\n" + text
-    if file.startswith("tests/") and file.endswith("/CMakeLists.txt"):
-        return text.replace("DISABLE_PRECOMPILE_HEADERS ON", "DISABLE_PRECOMPILE_HEADERS OFF")
-    return text
+    """The text of a file for a build that takes less time."""
+    return text + OF_THE_LIBRARY if file == "src/CMakeLists.txt" else text
 
 
 class Program:
     """A test program."""
 
-    def __init__(self, folder, name, shared, arguments=("--gtest_fail_fast",)):
-        self.folder, self.name, self.shared, self.arguments = folder, name, shared, arguments
+    def __init__(self, name, shared, arguments=("--gtest_fail_fast",)):
+        self.name, self.shared, self.arguments = name, shared, arguments
         self.filters = ["*"]  # each for a run of its own
         self.seconds = 0.0
 
 
+# Those of the library's behaviour, on the shared library and with its objects linked in.
+ON_THE_LIBRARY = ("api_audio_device_test", "api_first_calls_test", "api_header_test", "api_object_layout_test",
+                  "api_odd_arguments_test", "oracle_test")
+WITH_ITS_OBJECTS = ("allocation_failure_test", "exhaustion_test", "stress_test", "unit_test")
+
+
 def test_programs():
-    """Those of the library's behaviour."""
-    programs = []
-    for lists in sorted((ROOT / "tests").glob("*/CMakeLists.txt")):
-        if lists.parent.name not in ("platform", "tools"):
-            text = lists.read_text(encoding="utf-8")
-            for kind, name in re.findall(r"^senseloom_(\w*)test\(\s*(\w+)", text, re.MULTILINE):
-                programs.append(Program(lists.parent.name, name, kind == "api_"))
-    programs.append(Program("api", "case_runner", True, sorted((ROOT / "tests" / "cases").glob("*.jsonl"))))
-    return programs
+    cases = Program("case_runner", True, sorted((ROOT / "tests" / "cases").glob("*.jsonl")))
+    return [cases, *(Program(name, True) for name in ON_THE_LIBRARY), *(Program(name, False) for name in WITH_ITS_OBJECTS)]
 
 
 class Copy:
@@ -345,11 +338,10 @@ class Copy:
             original.write_text(text, encoding="utf-8")
 
 
-def fates_of(mutants, jobs, verbose):
-    """What becomes of each mutant, by its name."""
+def made_copies(jobs, programs):
+    """Copies of the tree, each built, with the time that each program takes."""
     resource.setrlimit(resource.RLIMIT_AS, (MOST_MEMORY, MOST_MEMORY))
     resource.setrlimit(resource.RLIMIT_CORE, (0, 0))
-    programs = test_programs()
     copies = [Copy(ROOT / "build" / "mutants" / str(number)) for number in range(jobs)]
     for copy in copies:
         copy.configure()
@@ -357,7 +349,13 @@ def fates_of(mutants, jobs, verbose):
             sys.exit(f"the build in {copy.build} fails without any mutant")
     for program in programs:
         copies[0].calibrate(program)
+    return copies
 
+
+def fates_of(mutants, jobs, verbose):
+    """What becomes of each mutant, by its name."""
+    programs = test_programs()
+    copies = made_copies(jobs, programs)
     fates = {}
     last_killers = {}  # by file: what killed one of its mutants often kills the next
     queue = iter(mutants)
@@ -370,8 +368,7 @@ def fates_of(mutants, jobs, verbose):
                 mutant = next(queue, None)
             if mutant is None:
                 return
-            folder = pathlib.PurePath(mutant.file).parts[1]
-            order = sorted(programs, key=lambda program: (program.folder != "api", program.folder != folder,
+            order = sorted(programs, key=lambda program: (not program.shared,
                                                           program.name != last_killers.get(mutant.file),
                                                           program.seconds))
             fate = copy.fate(mutant, order, library)
@@ -417,24 +414,30 @@ def main():
     fates = fates_of(mutants, arguments.jobs, arguments.verbose)
     minutes = (time.monotonic() - started) / 60
 
-    failed = bool(stale)
     for name in stale:
         print(f"listed as equivalent, but there is no such mutant: {name}")
+    failed = report(fates, arguments.equivalent, minutes, len(equivalent))
+    sys.exit(1 if stale or failed else 0)
+
+
+def report(fates, are_equivalent, minutes, listed):
+    """Prints what became of the mutants; returns whether that is a failure."""
+    failed = False
     for name, fate in sorted(fates.items()):
-        if arguments.equivalent and fate != "survived":
+        if are_equivalent and fate != "survived":
             print(f"listed as equivalent, but {fate}: {name}")
             failed = True
-        elif fate == "survived" and not arguments.equivalent:
+        elif fate == "survived" and not are_equivalent:
             print(f"survived: {name}")
     counts = collections.Counter(fate.split()[0] for fate in fates.values())
-    print(f"{len(mutants)} mutants in {minutes:.0f} minutes: {counts['does']} do not compile, {counts['same']} are the "
+    print(f"{len(fates)} mutants in {minutes:.0f} minutes: {counts['does']} do not compile, {counts['same']} are the "
           f"same code, {counts['survived']} survived, {counts['killed']} killed")
-    if not arguments.equivalent:
-        tried = counts["killed"] + counts["survived"]
-        score = counts["killed"] / tried if tried else 1.0
-        print(f"{score:.1%} killed, and {len(equivalent)} more listed as equivalent")
-        failed = failed or score < LEAST_SCORE
-    sys.exit(1 if failed else 0)
+    if are_equivalent:
+        return failed
+    tried = counts["killed"] + counts["survived"]
+    score = counts["killed"] / tried if tried else 1.0
+    print(f"{score:.1%} killed, and {listed} more listed as equivalent")
+    return score < LEAST_SCORE
 
 
 if __name__ == "__main__":

@@ -183,65 +183,67 @@ struct Wrong {
   const char* member;
 };
 
+// A line on an open session "a" of the sensor, and the member that is wrong there.
+const Wrong kWrongLines[] = {
+    {"STAP", R"({"call":"set_option","session":"a","option":{},"returned":1,"properties":{"classMask":3,"level":0}})",
+     "returned"},
+    {"STAP", R"({"call":"set_option","session":"a","option":{},"returned":0})", "properties"},
+    {"STAP", R"({"call":"set_option","session":"a","option":{},"returned":0,"properties":{"classMask":3}})",
+     "properties"},
+    {"STAP", R"({"call":"set_option","session":"a","option":{},"returned":0,"properties":{"level":0,"classMask":3}})",
+     "properties"},
+    {"STAP", R"({"call":"set_option","session":"a","option":{},"returned":0,"properties":[]})", "properties"},
+    {"STAP", R"({"call":"set_option","session":"a","option":"{","returned":-1,"properties":{}})", "properties"},
+    {"STAP", R"({"call":"set_option","session":"a","option":"{","returned":-1,"out":"untouched"})", "out"},
+    {"STAP", R"({"call":"set_option","session":"a","option":null,"returned":-1})", "out"},
+    {"STAP",
+     R"({"call":"set_option","session":"a","option":{},"returned":0,"properties":{"classMask":3,"level":0},)"
+     R"("log":[]})",
+     "log"},
+    {"STAP",
+     R"({"call":"set_option","session":"a","option":{},"returned":0,"properties":{"classMask":3,"level":0},)"
+     R"("log":["I/Libsl: The 0 of 1 session of sensor STAP has {b} option!\n"]})",
+     "log"},
+    {"SHAKI", R"({"call":"set_option","session":"a","option":"","returned":-1})", "log"},
+    {"SHAKI",
+     R"({"call":"set_option","session":"a","option":"","returned":-1,)"
+     R"("log":["D/libsenseloom: shaking: invalid opton string , all set as default"]})",
+     "log"},
+    {"SHAKI",
+     R"({"call":"set_option","session":"a","option":"","returned":-1,)"
+     R"("log":["E/STY: shaking: invalid opton string , all set as default"]})",
+     "log"},
+    {"SHAKI", R"({"call":"dispatch","session":"a","record":{"hex":"00"},"returned":1})", "result"},
+    {"SHAKI", R"({"call":"dispatch","session":"a","record":{"hex":"00"},"returned":1,"result":{"hex":"00"}})",
+     "result"},
+    {"PDR",
+     R"({"call":"dispatch","session":"a","record":{"timestamp":1,"items":["<28 01>"]},"returned":1,)"
+     R"("result":"own record"})",
+     "result"},
+    {"PDR",
+     R"({"call":"dispatch","session":"a","record":{"timestamp":1,"items":["<28 01>"]},"returned":1,)"
+     R"("result":{"timestamp":1,"items":["<27 01>02"]}})",
+     "result"},
+    {"PDR",
+     R"({"call":"dispatch","session":"a","record":{"timestamp":1,"items":["<28 01>"]},"returned":1,)"
+     R"("result":{"hex":"01"}})",
+     "result"},
+    {"STAP",
+     R"({"call":"dispatch","session":"a","record":{"timestamp":1,"classes":0},"returned":0,)"
+     R"("result":"own record"})",
+     "result"},
+    {"STAP", R"({"call":"audio_hal_init","returned":true,"log":[],"platformCalls":[]})", "platformCalls"},
+    {"STAP", R"({"call":"audio_hal_init","returned":false,"log":[],"platformCalls":[]})", "returned"},
+    {"STAP", R"({"call":"open","session":"g","sensor":"GSPX","returned":"handle"})", "platformCalls"},
+    {"STAP", R"({"call":"open","session":"g","sensor":"GSPX","returned":null})", "returned"},
+    {"STAP", R"({"call":"getSensor","sensor":"STAP","returned":null})", "returned"},
+    {"STAP", R"({"call":"uninit","device":"open"})", "device"},
+    {"STAP", R"({"call":"uninit","platformCalls":["close"]})", "platformCalls"},
+    {"STAP", R"({"call":"close","session":"a","returned":1})", "returned"},
+};
+
 TEST(CaseRun, OverlooksNothing) {
-  const Wrong lines[] = {
-      {"STAP", R"({"call":"set_option","session":"a","option":{},"returned":1,"properties":{"classMask":3,"level":0}})",
-       "returned"},
-      {"STAP", R"({"call":"set_option","session":"a","option":{},"returned":0})", "properties"},
-      {"STAP", R"({"call":"set_option","session":"a","option":{},"returned":0,"properties":{"classMask":3}})",
-       "properties"},
-      {"STAP", R"({"call":"set_option","session":"a","option":{},"returned":0,"properties":{"level":0,"classMask":3}})",
-       "properties"},
-      {"STAP", R"({"call":"set_option","session":"a","option":{},"returned":0,"properties":[]})", "properties"},
-      {"STAP", R"({"call":"set_option","session":"a","option":"{","returned":-1,"properties":{}})", "properties"},
-      {"STAP", R"({"call":"set_option","session":"a","option":"{","returned":-1,"out":"untouched"})", "out"},
-      {"STAP", R"({"call":"set_option","session":"a","option":null,"returned":-1})", "out"},
-      {"STAP",
-       R"({"call":"set_option","session":"a","option":{},"returned":0,"properties":{"classMask":3,"level":0},)"
-       R"("log":[]})",
-       "log"},
-      {"STAP",
-       R"({"call":"set_option","session":"a","option":{},"returned":0,"properties":{"classMask":3,"level":0},)"
-       R"("log":["I/Libsl: The 0 of 1 session of sensor STAP has {b} option!\n"]})",
-       "log"},
-      {"SHAKI", R"({"call":"set_option","session":"a","option":"","returned":-1})", "log"},
-      {"SHAKI",
-       R"({"call":"set_option","session":"a","option":"","returned":-1,)"
-       R"("log":["D/libsenseloom: shaking: invalid opton string , all set as default"]})",
-       "log"},
-      {"SHAKI",
-       R"({"call":"set_option","session":"a","option":"","returned":-1,)"
-       R"("log":["E/STY: shaking: invalid opton string , all set as default"]})",
-       "log"},
-      {"SHAKI", R"({"call":"dispatch","session":"a","record":{"hex":"00"},"returned":1})", "result"},
-      {"SHAKI", R"({"call":"dispatch","session":"a","record":{"hex":"00"},"returned":1,"result":{"hex":"00"}})",
-       "result"},
-      {"PDR",
-       R"({"call":"dispatch","session":"a","record":{"timestamp":1,"items":["<28 01>"]},"returned":1,)"
-       R"("result":"own record"})",
-       "result"},
-      {"PDR",
-       R"({"call":"dispatch","session":"a","record":{"timestamp":1,"items":["<28 01>"]},"returned":1,)"
-       R"("result":{"timestamp":1,"items":["<27 01>02"]}})",
-       "result"},
-      {"PDR",
-       R"({"call":"dispatch","session":"a","record":{"timestamp":1,"items":["<28 01>"]},"returned":1,)"
-       R"("result":{"hex":"01"}})",
-       "result"},
-      {"STAP",
-       R"({"call":"dispatch","session":"a","record":{"timestamp":1,"classes":0},"returned":0,)"
-       R"("result":"own record"})",
-       "result"},
-      {"STAP", R"({"call":"audio_hal_init","returned":true,"log":[],"platformCalls":[]})", "platformCalls"},
-      {"STAP", R"({"call":"audio_hal_init","returned":false,"log":[],"platformCalls":[]})", "returned"},
-      {"STAP", R"({"call":"open","session":"g","sensor":"GSPX","returned":"handle"})", "platformCalls"},
-      {"STAP", R"({"call":"open","session":"g","sensor":"GSPX","returned":null})", "returned"},
-      {"STAP", R"({"call":"getSensor","sensor":"STAP","returned":null})", "returned"},
-      {"STAP", R"({"call":"uninit","device":"open"})", "device"},
-      {"STAP", R"({"call":"uninit","platformCalls":["close"]})", "platformCalls"},
-      {"STAP", R"({"call":"close","session":"a","returned":1})", "returned"},
-  };
-  for (const auto& [sensor, line, member] : lines) {
+  for (const auto& [sensor, line, member] : kWrongLines) {
     const std::string open =
         std::string(R"({"call":"open","session":"a","returned":"handle","sensor":")") + sensor + "\"}\n";
     EXPECT_NE(ran(open + line).find(std::string("library: \"") + member + '"'), std::string::npos) << line << '\n'

@@ -137,31 +137,13 @@ Observation Client::make(const Call& call, void* handle) {
   Observation observation;
   auto& returned = observation.outcome.returned;
   switch (call.what) {
-    case Call::open: {
-      const std::string name = sensorNameOf(call);
-      void* session = ctx_open_session(call.misuse == Call::nullName ? nullptr : name.c_str());
-      returned = session != nullptr ? 1 : 0;
-      observation.opened = session;
-      noteOpened(call, session);
+    case Call::open:
+      observation = open(call);
       break;
-    }
     case Call::setOption:
-    case Call::close: {
-      const bool isClose = call.what == Call::close;
-      const std::string text = call.option.text();
-      gaveTemplates = gaveTemplates || text.find("template") != std::string::npos;
-      auto* const untouched = static_cast<ctx_option_t*>(kUntouchedPointer);
-      ctx_option_t* list = untouched;
-      ctx_option_t** out = call.misuse == Call::nullOut ? nullptr : &list;
-      returned = isClose ? ctx_close_session(handle, out)
-                         : ctx_set_option(handle, kUntouched, call.option.isNull ? nullptr : text.c_str(), out);
-      observation.outcome.storesList = list != untouched;
-      if (list != untouched && list != nullptr) {
-        observation.list = list;
-        observation.outcome.list = propertiesOf(list, observation.complaint);
-      }
+    case Call::close:
+      observation = negotiate(call, handle);
       break;
-    }
     case Call::dispatch:
     case Call::dispatchToSensor:
       observation = dispatch(call, handle);
@@ -183,6 +165,34 @@ Observation Client::make(const Call& call, void* handle) {
       break;
   }
   observePlatform(observation);
+  return observation;
+}
+
+Observation Client::open(const Call& call) {
+  const std::string name = sensorNameOf(call);
+  void* const session = ctx_open_session(call.misuse == Call::nullName ? nullptr : name.c_str());
+  noteOpened(call, session);
+  Observation observation;
+  observation.outcome.returned = session != nullptr ? 1 : 0;
+  observation.opened = session;
+  return observation;
+}
+
+Observation Client::negotiate(const Call& call, void* handle) {
+  const std::string text = call.option.text();
+  gaveTemplates = gaveTemplates || text.find("template") != std::string::npos;
+  auto* const untouched = static_cast<ctx_option_t*>(kUntouchedPointer);
+  ctx_option_t* list = untouched;
+  ctx_option_t** out = call.misuse == Call::nullOut ? nullptr : &list;
+  Observation observation;
+  observation.outcome.returned =
+      call.what == Call::close ? ctx_close_session(handle, out)
+                               : ctx_set_option(handle, kUntouched, call.option.isNull ? nullptr : text.c_str(), out);
+  observation.outcome.storesList = list != untouched;
+  if (list != untouched && list != nullptr) {
+    observation.list = list;
+    observation.outcome.list = propertiesOf(list, observation.complaint);
+  }
   return observation;
 }
 

@@ -64,6 +64,8 @@ class Client {
   };
 
   void noteOpened(const Call& call, void* handle);
+  Observation open(const Call& call);
+  Observation negotiate(const Call& call, void* handle);
   Observation dispatch(const Call& call, void* handle);
 
   std::map<int, Session> sessions;

@@ -51,12 +51,6 @@ TEST_F(Negotiation, MergesAllOptionsInOpeningOrderThenReplacesAndRenders) {
   EXPECT_EQ(list->properties[0].value, isNew);
 }
 
-TEST_F(Negotiation, LogsEachSession) {
-  negotiate(sensor, option("new"), &list);
-  EXPECT_EQ(fake::platform().takeLog(), (Log{fake::mergeLine(0, 3, sessions[0]), fake::mergeLine(1, 3, sessions[1]),
-                                             fake::mergeLine(2, 3, sessions[2])}));
-}
-
 TEST_F(Negotiation, WithoutSessionsMergesNothing) {
   sensor.sessions.clear();
   negotiate(sensor, option("new"), &list);
