@@ -5,7 +5,6 @@
 #include <cstddef>
 #include <cstring>
 #include <limits>
-#include <new>
 
 namespace senseloom {
 namespace {
@@ -17,12 +16,12 @@ void requireMemoryToRead(const char* text) {
   constexpr size_t kBytesPerCharacter = 24 * sizeof(void*);
   constexpr size_t kLeastBytes = 1024;
   const size_t length = std::strlen(text);
-  if (length > (std::numeric_limits<size_t>::max() - kLeastBytes) / kBytesPerCharacter) throw std::bad_alloc();
+  if (length > (std::numeric_limits<size_t>::max() - kLeastBytes) / kBytesPerCharacter) throw OutOfMemory();
   json_malloc_t take = nullptr;
   json_free_t giveBack = nullptr;
   json_get_alloc_funcs(&take, &giveBack);
   void* const memory = take(kLeastBytes + kBytesPerCharacter * length);
-  if (memory == nullptr) throw std::bad_alloc();
+  if (memory == nullptr) throw OutOfMemory();
   giveBack(memory);
 }
 
@@ -30,7 +29,7 @@ void requireMemoryToRead(const char* text) {
 class CLocale {
  public:
   CLocale() : own(newlocale(LC_ALL_MASK, "C", nullptr)) {
-    if (own == nullptr) throw std::bad_alloc();
+    if (own == nullptr) throw OutOfMemory();
     before = uselocale(own);
   }
   ~CLocale() {
