@@ -18,7 +18,7 @@ constexpr FateRow kFateRows[kFates] = {
     {"batch filling", ": %d of %d items"},
     {"class not wanted", ": bits %d, mask %d"},
     {"unchanged", ": class %d as before"},
-    {"step not a multiple", ": %d is none of %d"},
+    {"step not a multiple", ": %d is not a multiple of %d"},
     {"no gesture recognised", ""},
     {"no items", ""},
     {"too short", ": ends before its class or count"},
@@ -93,7 +93,7 @@ Remark nullText() {
 
 Remark notJson(const std::string& error, bool isAccepted, std::string logged) {
   const char* outcome = isAccepted ? "accepted all the same, and the session keeps its option" : "refused";
-  return {"no JSON (" + error + "): " + outcome, std::move(logged)};
+  return {"not JSON (" + error + "): " + outcome, std::move(logged)};
 }
 
 Remark notAnObject() {

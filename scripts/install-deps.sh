@@ -48,7 +48,7 @@ export DEBIAN_FRONTEND=noninteractive
 log=$(mktemp)
 trap 'rm -f "$log"' EXIT
 if [ "$host" = amd64 ]; then dpkg --add-architecture i386; fi
-# An index that can not be fetched may well not be one that is needed: the installation decides.
+# An index that cannot be fetched may well not be one that is needed: the installation decides.
 apt-get update >"$log" 2>&1 || true
 # shellcheck disable=SC2086 # one word a package
 if ! apt-get install -y --no-install-recommends --no-remove $missing >>"$log" 2>&1; then

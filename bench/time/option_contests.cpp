@@ -1,5 +1,5 @@
-// Options: one client of the activity sensor changes its wishes, those of all are merged, every client starts over, and
-// the merged settings are delivered as properties.
+// Options: one client of the activity sensor changes its requests, those of all are merged, every client starts over,
+// and the merged settings are delivered as properties.
 #include <jansson.h>
 #include <sigc++/sigc++.h>
 
@@ -31,7 +31,7 @@ constexpr const char* kTexts[] = {
     R"({"mode": 0, "logN": 2, "logM": 0, "classMask": 48, "summary": 1, "weightVar": 1, "continuous": 1})",
 };
 
-struct Wishes {
+struct Requests {
   int mode = 0;
   int logN = 0;
   int logM = 0;
@@ -41,7 +41,7 @@ struct Wishes {
   int continuous = 0;
   int largestLogN = 0;
 
-  void merge(const Wishes& other) {
+  void merge(const Requests& other) {
     largestLogN = std::max(largestLogN, other.logN);
     mode = mode == 1 && other.mode == 1 && logN == other.logN ? 1 : 0;
     logN = std::min(logN, other.logN);
@@ -57,7 +57,7 @@ struct Property {
 };
 using Properties = std::array<Property, 4>;
 
-Properties propertiesOf(const Wishes& merged) {
+Properties propertiesOf(const Requests& merged) {
   return {{
       {41, merged.mode},
       {43, (1 << merged.largestLogN) << 16 | 1 << merged.logN},
@@ -99,21 +99,21 @@ class OptionsOfLibrary {
 template <class Sink>
 class OptionsInlined {
  public:
-  OptionsInlined(size_t count, Sink& results) : wishes(count), gathered(count), sink(results) {}
+  OptionsInlined(size_t count, Sink& results) : requests(count), gathered(count), sink(results) {}
 
   void operator()() {
     for (const char* text : kTexts) {
-      wishes.front() = read(text);
-      Wishes merged = wishes.front();
-      for (const Wishes& each : wishes) merged.merge(each);
+      requests.front() = read(text);
+      Requests merged = requests.front();
+      for (const Requests& each : requests) merged.merge(each);
       std::fill(gathered.begin(), gathered.end(), 0);
       deliver(propertiesOf(merged), sink);
     }
   }
 
  private:
-  static Wishes read(std::string_view text) {
-    Wishes result;
+  static Requests read(std::string_view text) {
+    Requests result;
     const char* next = text.data();
     for (int* value : {&result.mode, &result.logN, &result.logM, &result.classMask, &result.summary, &result.weightVar,
                        &result.continuous}) {
@@ -125,7 +125,7 @@ class OptionsInlined {
     return result;
   }
 
-  std::vector<Wishes> wishes;
+  std::vector<Requests> requests;
   std::vector<int> gathered;  // decisions of the batch that each client is gathering
   Sink& sink;
 };
@@ -137,7 +137,7 @@ Json parsed(const char* text) {
 
 // A client of the ways below.
 struct OptionClient {
-  Wishes wishes;
+  Requests requests;
   std::vector<int> batch;
 
   void setWishes(const char* text) {
@@ -146,28 +146,28 @@ struct OptionClient {
       const json_t* value = json_object_get(root.get(), key);
       return std::clamp(json_is_integer(value) ? static_cast<int>(json_integer_value(value)) : missing, low, high);
     };
-    wishes.mode = read("mode", 0, 0, 1);
-    wishes.logN = read("logN", 0, 0, 8);
-    wishes.logM = read("logM", 0, 0, wishes.logN);
-    wishes.classMask = read("classMask", -1, -1, 255);
-    wishes.summary = read("summary", 1, 0, 1);
-    wishes.weightVar = read("weightVar", -1, -1, 31);
-    wishes.continuous = read("continuous", 0, 0, 1);
-    wishes.largestLogN = wishes.logN;
+    requests.mode = read("mode", 0, 0, 1);
+    requests.logN = read("logN", 0, 0, 8);
+    requests.logM = read("logM", 0, 0, requests.logN);
+    requests.classMask = read("classMask", -1, -1, 255);
+    requests.summary = read("summary", 1, 0, 1);
+    requests.weightVar = read("weightVar", -1, -1, 31);
+    requests.continuous = read("continuous", 0, 0, 1);
+    requests.largestLogN = requests.logN;
   }
 
-  void startOver(const Wishes& merged) {
+  void startOver(const Requests& merged) {
     batch.clear();
-    batch.reserve(size_t{1} << (wishes.logN - merged.logM));
+    batch.reserve(size_t{1} << (requests.logN - merged.logM));
   }
 };
 
-// What combines the answers of a signal's slots, each the wishes of a client.
+// What combines the answers of a signal's slots, each the requests of a client.
 struct Merging {
-  using result_type = Wishes;
+  using result_type = Requests;
   template <class Iterator>
-  Wishes operator()(Iterator first, Iterator last) const {
-    Wishes merged = **first;
+  Requests operator()(Iterator first, Iterator last) const {
+    Requests merged = **first;
     for (; first != last; ++first) merged.merge(**first);
     return merged;
   }
@@ -178,15 +178,15 @@ class OptionsBySignal {
  public:
   OptionsBySignal(size_t count, Sink& results) : clients(count), sink(results) {
     for (OptionClient& client : clients) {
-      ask.connect([&client]() -> const Wishes* { return &client.wishes; });
-      tell.connect([&client](const Wishes& merged) { client.startOver(merged); });
+      ask.connect([&client]() -> const Requests* { return &client.requests; });
+      tell.connect([&client](const Requests& merged) { client.startOver(merged); });
     }
   }
 
   void operator()() {
     for (const char* text : kTexts) {
       clients.front().setWishes(text);
-      const Wishes merged = ask();
+      const Requests merged = ask();
       tell(merged);
       const auto list = propertiesOf(merged);
       deliver(std::vector(list.begin(), list.end()), sink);
@@ -201,11 +201,12 @@ class OptionsBySignal {
 };
 
 namespace signals = boost::signals2;
-using BoostAsk = signals::signal_type<const Wishes*(), signals::keywords::combiner_type<Merging>,
+using BoostAsk = signals::signal_type<const Requests*(), signals::keywords::combiner_type<Merging>,
                                       signals::keywords::mutex_type<signals::dummy_mutex>>::type;
-using BoostTell = signals::signal_type<void(const Wishes&), signals::keywords::mutex_type<signals::dummy_mutex>>::type;
-using SigcAsk = sigc::signal<const Wishes*>::accumulated<Merging>;
-using SigcTell = sigc::signal<void, const Wishes&>;
+using BoostTell =
+    signals::signal_type<void(const Requests&), signals::keywords::mutex_type<signals::dummy_mutex>>::type;
+using SigcAsk = sigc::signal<const Requests*>::accumulated<Merging>;
+using SigcTell = sigc::signal<void, const Requests&>;
 
 template <class Sink>
 class OptionsByHashMap {
@@ -214,8 +215,8 @@ class OptionsByHashMap {
     for (OptionClient& client : clients) {
       functions[&client] = {
           [&client](const char* text) { client.setWishes(text); },
-          [&client]() -> const Wishes& { return client.wishes; },
-          [&client](const Wishes& merged) { client.startOver(merged); },
+          [&client]() -> const Requests& { return client.requests; },
+          [&client](const Requests& merged) { client.startOver(merged); },
       };
     }
   }
@@ -225,7 +226,7 @@ class OptionsByHashMap {
       const auto found = functions.find(&clients.front());
       if (found == functions.end()) continue;
       found->second.set(text);
-      Wishes merged = found->second.ask();
+      Requests merged = found->second.ask();
       for (const auto& [handle, client] : functions) merged.merge(client.ask());
       for (const auto& [handle, client] : functions) client.tell(merged);
       const auto list = propertiesOf(merged);
@@ -236,8 +237,8 @@ class OptionsByHashMap {
  private:
   struct Functions {
     std::function<void(const char*)> set;
-    std::function<const Wishes&()> ask;
-    std::function<void(const Wishes&)> tell;
+    std::function<const Requests&()> ask;
+    std::function<void(const Requests&)> tell;
   };
 
   std::vector<OptionClient> clients;
@@ -253,8 +254,8 @@ class OptionsByRanges {
   void operator()() {
     for (const char* text : kTexts) {
       clients.front().setWishes(text);
-      const auto merged = ranges::accumulate(clients | ranges::views::transform(&OptionClient::wishes),
-                                             clients.front().wishes, [](Wishes all, const Wishes& each) {
+      const auto merged = ranges::accumulate(clients | ranges::views::transform(&OptionClient::requests),
+                                             clients.front().requests, [](Requests all, const Requests& each) {
                                                all.merge(each);
                                                return all;
                                              });

@@ -126,10 +126,10 @@ TEST_F(Reasons, TellOfDefaultsThatAreLogged) {
 
 TEST_F(Reasons, TellWhetherTextThatIsNotJsonIsAccepted) {
   EXPECT_EQ(remarks(gsflk, "x"),
-            "no JSON ('[' or '{' expected near 'x'): refused\n"
+            "not JSON ('[' or '{' expected near 'x'): refused\n"
             "  gestureflick: invalid opton string x, all set as default\n");
   EXPECT_EQ(remarks(scoun, "x"),
-            "no JSON ('[' or '{' expected near 'x'): accepted all the same, and the session keeps its option\n");
+            "not JSON ('[' or '{' expected near 'x'): accepted all the same, and the session keeps its option\n");
   EXPECT_EQ(model.setOption(open(isact), nullptr, true).why.remarks[0].text, "a null pointer is refused");
 }
 
@@ -204,7 +204,7 @@ TEST_F(Reasons, ShowTheClassesOfARecordAndTheMask) {
   EXPECT_EQ(judged(tapping, valued(1, 2)), "class not wanted: bits 1, mask 2");
   const void* coach = open(scoun);
   set(coach, R"({"mode":0,"logN":5})");
-  EXPECT_EQ(judged(coach, valued(501, 4)), "step not a multiple: 501 is none of 500");
+  EXPECT_EQ(judged(coach, valued(501, 4)), "step not a multiple: 501 is not a multiple of 500");
 }
 
 TEST_F(Reasons, CountGatheredItems) {

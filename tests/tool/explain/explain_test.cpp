@@ -221,7 +221,7 @@ TEST(ExplainErrors, OfAnOptionComeAfterItsExplanation) {
   const ToolRun run = runTool({"explain", "ISACT", "none"});
   EXPECT_EQ(run.out,
             "session 1 on ISACT sets none\n"
-            "  no JSON ('[' or '{' expected near 'none'): accepted all the same, and the session keeps its option\n"
+            "  not JSON ('[' or '{' expected near 'none'): accepted all the same, and the session keeps its option\n"
             "    logged: instantactivity: invalid opton string none, all set as default\n"
             "  key        merged to   session 1   merged  property  decided by\n"
             "  classMask  bitwise or  15 default  15      151 = 15  session 1\n");

@@ -118,7 +118,7 @@ TEST(Explainer, SaysWhenALibraryRefusesWithoutAReason) {
 TEST(Explainer, SaysWhenALibraryAcceptsWhatItShouldRefuse) {
   EXPECT_EQ(explained("STAP", [](Explaining& a) { a.set("{", 0, std::nullopt); }),
             "line 7: a on STAP sets {\n"
-            "  no JSON (string or '}' expected near end of file): refused\n"
+            "  not JSON (string or '}' expected near end of file): refused\n"
             "  unexplained: the library returned 0, where -1 was derived\n");
 }
 
