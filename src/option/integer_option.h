@@ -2,6 +2,7 @@
 
 #include <jansson.h>
 
+#include <algorithm>
 #include <array>
 #include <cstddef>
 #include <cstdint>
@@ -54,9 +55,7 @@ class IntegerOption : public Option {
 
   void setProperty(ctx_option_t** out) final {
     if (out == nullptr) return;
-    for (size_t i = 0; i < mirrors.size(); ++i) {
-      mirrors[i] = kShownKeys[i] < settings.size() ? settings[kShownKeys[i]] : compute(kDescription.properties[i]);
-    }
+    for (size_t i = 0; i < mirrors.size(); ++i) mirrors[i] = valueOf(i);
     *out = makeList(kDescription, mirrors);
   }
 
@@ -82,10 +81,21 @@ class IntegerOption : public Option {
     return keys;
   }();
 
+  static constexpr bool kComputes =
+      std::ranges::any_of(kShownKeys, [](size_t key) { return key == kDescription.keys.size(); });
+
   // Called at the end of a parse that took the string, with the values as they were given.
   virtual void adjust(const Settings& /*given*/) {}
-  // The value of a property that shows no key's setting.
-  virtual int32_t compute(const OptionProperty& /*property*/) const { return 0; }
+
+  // What a property shows. Where it is no key's setting, the kind has a compute(property).
+  int32_t valueOf(size_t property) const {
+    if constexpr (kComputes) {
+      if (kShownKeys[property] == settings.size()) {
+        return static_cast<const Kind&>(*this).compute(kDescription.properties[property]);
+      }
+    }
+    return settings[kShownKeys[property]];
+  }
 
   Settings settings;
   Mirrors mirrors{};  // what the entries of the last property list point at

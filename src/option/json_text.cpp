@@ -29,7 +29,7 @@ void requireMemoryToRead(const char* text) {
 class CLocale {
  public:
   CLocale() : own(newlocale(LC_ALL_MASK, "C", nullptr)) {
-    if (own == nullptr) throw OutOfMemory();
+    if (own == nullptr) throw OutOfMemory();  // not covered: the C library of a host always has this one
     before = uselocale(own);
   }
   ~CLocale() {

@@ -14,7 +14,8 @@ uint32_t shiftLeft(uint32_t value, int32_t count) {
 
 void OptionActivity::adjust(const Settings& given) {
   set<kind.key("logM")>(std::min(logM(), logN()));
-  maxLogN = given[kind.key("logN")];
+  constexpr size_t kLogN = kind.key("logN");
+  maxLogN = given[kLogN];
 }
 
 void OptionActivity::merge(const Option& other) {

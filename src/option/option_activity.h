@@ -42,9 +42,11 @@ class OptionActivity final : public IntegerOption<OptionActivity, kActivity> {
   int32_t summary() const { return setting<kind.key("summary")>(); }
   int32_t weightVar() const { return setting<kind.key("weightVar")>(); }
 
+  // The value of a property that shows no key's setting.
+  int32_t compute(const OptionProperty& property) const;
+
  private:
   void adjust(const Settings& given) override;
-  int32_t compute(const OptionProperty& property) const override;
 
   int32_t maxLogN = 0;  // after a parse "logN" as it was given, not clamped; after a merge the largest of all
 };

@@ -29,7 +29,7 @@ bool hasNoSensor() {
 uint8_t byte = 0;
 void* result = &byte;
 int length = 5;
-ctx_option_t untouched{};
+ctx_option_t untouched;
 ctx_option_t* list = &untouched;
 
 // An entry point that needs the sensors, with arguments that are good and a handle that is not.

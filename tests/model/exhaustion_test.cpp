@@ -155,4 +155,17 @@ TEST(OptionStrings, AreRefusedOrMeanWhatTheySayWithoutMemoryForOneAllocation) {
   expectRefusalsUntilThereIsEnough(Shortage::once, 1, 1, 3);
 }
 
+#if UINTPTR_MAX == UINT32_MAX
+
+TEST(Exhaustion, StringThatWouldTakeMoreThanTheAddressSpaceToReadIsRefused) {
+  void* const session = ctx_open_session("LPE_P");
+  std::string text = R"({"interval":7})";
+  text.append(size_t{1} << 26, ' ');
+  ctx_option_t* list = nullptr;
+  EXPECT_EQ(ctx_set_option(session, 0, text.c_str(), &list), -1);
+  EXPECT_EQ(ctx_close_session(session, &list), 0);
+}
+
+#endif
+
 }  // namespace

@@ -32,6 +32,12 @@ TEST(ActivityCallbacks, MaskClearsClassesWhoseBitIsNotSet) {
   _activity_mask_func(nullptr, 0);
 }
 
+// Needs a fresh process, in which no sensor was ever made.
+TEST(ActivityAlone, CannotBuildWithoutItsSensor) {
+  SessionActivity session;
+  EXPECT_EQ(session.buildProc(), -1);
+}
+
 // A session alone, on a sensor that nothing was negotiated on.
 class Activity : public testing::Test {
  protected:
