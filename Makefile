@@ -81,5 +81,5 @@ mutants:
 
 lint:
 	$(call install,build test lint)
-	$(call build,native,-DBUILD_TESTING=ON)
-	scripts/lint.sh build/native
+	$(call build,lint,-DBUILD_TESTING=ON)
+	scripts/lint.sh build/lint

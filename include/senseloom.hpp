@@ -101,8 +101,8 @@ class PropertyList {
   std::unique_ptr<ctx_option_t, Release> list;
 };
 
-// What became of an option. Refused means that it is not JSON or not acceptable to the sensor, which stays as it was, or
-// that a step after the merge failed. The list is the sensor's new one; after a refusal there is none, but for one
+// What became of an option. Refused means that it is not JSON or not acceptable to the sensor, which stays as it was,
+// or that a step after the merge failed. The list is the sensor's new one; after a refusal there is none, but for one
 // case: when a session could not be rebuilt the sensor is to run with the new list all the same.
 struct OptionResult {
   bool accepted;

@@ -10,9 +10,9 @@ mapfile -t library < <(git ls-files 'src/*.cpp')
 
 clang-format --dry-run --Werror "${cpp[@]}"
 printf '%s\0' "${library[@]}" | xargs -0 -n 1 -P "$(nproc)" clang-tidy -p "$build" --quiet 2>/dev/null
-# cppcheck 2.10 does not know a function whose body is a try block.
+# cppcheck 2.10 takes the pointers of an array for integers.
 cppcheck --quiet --error-exitcode=1 --std=c++20 --language=c++ --enable=warning,performance,portability \
-  --suppress=syntaxError:src/api/session_api.cpp -I include -I src "${library[@]}"
+  --suppress=CastIntegerToAddressAtReturn:src/registry/registry.cpp -I include -I src "${library[@]}"
 # "opton" is a text of the library, letter for letter; some tests mistype on purpose.
 codespell --ignore-words-list=opton,inout,stap,allone,opne,levle --skip='./build,./.git,./fuzz/corpus,*.svg,*.jsonl,LICENSE,*templates.inc' .
 shellcheck "${scripts[@]}"

@@ -1,5 +1,6 @@
-// How much of the heap an open session holds. Prints a line for each case: the sizes of a session's objects in bytes, its
-// share of the tables that know all sessions, what the heap itself adds to each block, and the number of its blocks.
+// How much of the heap an open session holds. Prints a line for each case: the sizes of a session's objects in bytes,
+// its share of the tables that know all sessions, what the heap itself adds to each block, and the number of its
+// blocks.
 #include <malloc.h>
 #include <sys/wait.h>
 #include <unistd.h>

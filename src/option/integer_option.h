@@ -24,6 +24,14 @@ bool readKeys(const OptionDescription& kind, const char* text, std::span<int32_t
 // A property list whose entries point at `values`, one for each property of the kind; null when memory ran out.
 ctx_option_t* makeList(const OptionDescription& kind, std::span<int32_t> values);
 
+// For each property of a kind the key whose setting it shows; the number of keys where it shows none.
+template <const OptionDescription& kDescription>
+constexpr auto shownKeys() {
+  std::array<size_t, kDescription.properties.size()> keys{};
+  for (size_t i = 0; i < keys.size(); ++i) keys[i] = kDescription.findKey(kDescription.properties[i].name);
+  return keys;
+}
+
 // An option whose keys are all integers: it does what its kind's description says. `Kind` is the class that derives
 // from this one; it adds its own code where it is peculiar.
 template <class Kind, const OptionDescription& kDescription>
@@ -74,13 +82,7 @@ class IntegerOption : public Option {
 
  private:
   using Mirrors = std::array<int32_t, kDescription.properties.size()>;
-  // For each property the key whose setting it shows.
-  static constexpr auto kShownKeys = [] {
-    std::array<size_t, kDescription.properties.size()> keys{};
-    for (size_t i = 0; i < keys.size(); ++i) keys[i] = kDescription.findKey(kDescription.properties[i].name);
-    return keys;
-  }();
-
+  static constexpr auto kShownKeys = shownKeys<kDescription>();
   static constexpr bool kComputes =
       std::ranges::any_of(kShownKeys, [](size_t key) { return key == kDescription.keys.size(); });
 

@@ -12,8 +12,8 @@
 #include "client.h"
 #include "explain/explainer.h"
 #include "input_error.h"
-#include "trace/replayer.h"
 #include "trace/hex.h"
+#include "trace/replayer.h"
 
 namespace oracle {
 namespace {
