@@ -84,7 +84,7 @@ class IntegerOption : public Option {
   using Mirrors = std::array<int32_t, kDescription.properties.size()>;
   static constexpr auto kShownKeys = shownKeys<kDescription>();
   static constexpr bool kComputes =
-      std::ranges::any_of(kShownKeys, [](size_t key) { return key == kDescription.keys.size(); });
+      std::any_of(kShownKeys.begin(), kShownKeys.end(), [](size_t key) { return key == kDescription.keys.size(); });
 
   // Called at the end of a parse that took the string, with the values as they were given.
   virtual void adjust(const Settings& /*given*/) {}

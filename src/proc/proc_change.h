@@ -15,7 +15,8 @@ class ProcChange {
   static constexpr size_t kElementSize = Previous::kElementSize;
 
   ProcChange() = default;
-  explicit ProcChange(Previous previous) : prev(previous) {}
+  template <class First, class... Arguments>
+  explicit ProcChange(First first, Arguments... ofPrevious) : prev(first, ofPrevious...) {}
 
   bool accept(const void* data, int count) {
     if (!prev.accept(data, count)) return false;

@@ -12,7 +12,8 @@ class ProcMask {
   static constexpr size_t kElementSize = Previous::kElementSize;
 
   ProcMask() = default;
-  ProcMask(Previous previous, int arg) : prev(previous), maskArg(arg) {}
+  template <class... Arguments>
+  explicit ProcMask(int arg, Arguments... ofPrevious) : prev(ofPrevious...), maskArg(arg) {}
 
   bool accept(const void* data, int count) {
     if (!prev.accept(data, count)) return false;

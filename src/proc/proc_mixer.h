@@ -13,7 +13,8 @@ class ProcMixer {
   static constexpr size_t kElementSize = Previous::kElementSize;
 
   ProcMixer() = default;
-  ProcMixer(Previous previous, Mix how) : prev(previous), mix(how) {}
+  template <class... Arguments>
+  explicit ProcMixer(Mix how, Arguments... ofPrevious) : prev(ofPrevious...), mix(how) {}
 
   bool accept(const void* data, int count) {
     // Asked first: most offers end there, as all do that come before the stage is reset.

@@ -39,16 +39,23 @@ uint16_t ActivityVote::vote(const uint8_t* batch, int count) const {
   const auto add = [&](int i, uint32_t weight) {
     scores[ActivityDecision::at(batch + static_cast<size_t>(i) * ActivityDecision::kSize).classId()] += weight;
   };
-  if (weightShift >= kGrowingShifts) {  // all weigh the same
+  const auto addUnknownClasses = [&] {
+    for (size_t id = kVotedClasses; id < scores.size(); ++id) scores[0] += scores[id];
+  };
+  if (weightShift >= kGrowingShifts) {  // all weigh the same, so that it is enough to count
     SENSELOOM_UNROLL
-    for (int i = 0; i < count; ++i) add(i, kFirstWeight);
-  } else {
-    const Weights& weights = kWeights[weightShift];
-    SENSELOOM_UNROLL
-    for (int i = 0; i < count; ++i) add(i, weights[static_cast<size_t>(i)]);
+    for (int i = 0; i < count; ++i) add(i, 1);
+    addUnknownClasses();
+    for (uint16_t id = 0; id < kVotedClasses; ++id) {
+      if (2 * scores[id] > static_cast<uint32_t>(count)) return id;
+    }
+    return kNoMajority;
   }
-  for (size_t id = kVotedClasses; id < scores.size(); ++id) scores[0] += scores[id];
 
+  const Weights& weights = kWeights[weightShift];
+  SENSELOOM_UNROLL
+  for (int i = 0; i < count; ++i) add(i, weights[static_cast<size_t>(i)]);
+  addUnknownClasses();
   uint16_t winner = 0;  // of several with the same score, the lowest id
   uint32_t total = scores[0];
   for (uint16_t id = 1; id < kVotedClasses; ++id) {

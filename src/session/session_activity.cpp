@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <new>
 
 #include "bytes.h"
 #include "session/context_sensor.h"
@@ -9,17 +10,28 @@
 
 namespace senseloom {
 
-SessionActivity::Chain SessionActivity::makeChain(std::span<uint8_t> batch) const {
-  const Batch first(batch);
-  const bool onChange = wanted.mode() == 1;
-  if (wanted.summary() == 0) {
-    const Decisions decisions(first, wanted.classMask());
-    if (onChange) return ProcChange<Decisions, _activity_equal_func>(decisions);
-    return decisions;
+void SessionActivity::makeChain(std::span<uint8_t> batch) {
+  const int mask = wanted.classMask();
+  const ActivityVote vote(wanted.weightVar());
+  if (wanted.mode() == 1) {
+    shape = wanted.summary() == 0 ? Shape::changedDecisions : Shape::changedVotes;
+  } else {
+    shape = wanted.summary() == 0 ? Shape::decisions : Shape::votes;
   }
-  const Votes votes({first, ActivityVote(wanted.weightVar())}, wanted.classMask());
-  if (onChange) return ProcChange<Votes, _activity_equal_func>(votes);
-  return votes;
+  switch (shape) {
+    case Shape::decisions:
+      new (&chain.decisions) Decisions(mask, batch);
+      break;
+    case Shape::changedDecisions:
+      new (&chain.changedDecisions) ChangedDecisions(mask, batch);
+      break;
+    case Shape::votes:
+      new (&chain.votes) Votes(mask, vote, batch);
+      break;
+    case Shape::changedVotes:
+      new (&chain.changedVotes) ChangedVotes(mask, vote, batch);
+      break;
+  }
 }
 
 int SessionActivity::buildProc() {
@@ -34,7 +46,7 @@ int SessionActivity::buildProc() {
     memory.reset(larger);
     memorySize = size;
   }
-  chain = makeChain({memory.get(), size});
+  makeChain({memory.get(), size});
   proc = &chain;
   return 0;
 }
@@ -44,31 +56,41 @@ int SessionActivity::postProcess(void* data, int len, void** out, int* outLen) n
   if (proc == nullptr) return passThrough(data, len, out, outLen);
 
   const auto record = recordBytes(data, len);
-  if (!record.empty()) {  // an empty record repeats what is in `work`
-    if (record.size() < kHeaderSize) return -1;
-    const auto count = static_cast<size_t>(std::max<int>(loadI16(record, kValueOffset), 0));
-    const size_t bytes = count * ActivityDecision::kSize;
-    if (record.size() < kHeaderSize + bytes) return -1;
-    std::memcpy(work.data(), record.data(), kHeaderSize);
-    copyBytes<ActivityDecision::kSize>(work.data() + kHeaderSize, record.data() + kHeaderSize,
-                                       std::min(bytes, work.size() - kHeaderSize));
-  }
-  // A batch takes at most as many decisions as `work` holds, however many are counted.
-  const int count = loadI16(work, kValueOffset);
-  return std::visit(
-      [&](auto& shape) { return shape.accept(work.data() + kHeaderSize, count) ? deliver(shape, out, outLen) : 0; },
-      chain);
+  if (record.empty()) return repeat(out, outLen);
+  if (record.size() < kHeaderSize) return -1;
+  const int16_t count = loadI16(record, kValueOffset);
+  const size_t bytes = static_cast<size_t>(std::max<int>(count, 0)) * ActivityDecision::kSize;
+  if (record.size() < kHeaderSize + bytes) return -1;
+
+  const uint8_t* const decisions = record.data() + kHeaderSize;
+  std::memcpy(work.data() + kTimestampOffset, record.data() + kTimestampOffset, kTimestampSize);
+  if (offer(decisions, count, out, outLen) == 1) return 1;
+  storeU16(work, kValueOffset, static_cast<uint16_t>(count));
+  copyBytes<ActivityDecision::kSize>(work.data() + kHeaderSize, decisions, std::min(bytes, work.size() - kHeaderSize));
+  return 0;
 }
 
-template <class Shape>
-int SessionActivity::deliver(Shape& shape, void** out, int* outLen) {
-  const auto delivered = static_cast<size_t>(shape.length());
+int SessionActivity::repeat(void** out, int* outLen) {
+  return offer(work.data() + kHeaderSize, loadI16(work, kValueOffset), out, outLen);
+}
+
+// A batch takes at most as many decisions as `work` holds, however many are counted.
+inline int SessionActivity::offer(const uint8_t* decisions, int count, void** out, int* outLen) {
+  const auto offerTo = [&](auto& last) { return last.accept(decisions, count) ? deliver(last, out, outLen) : 0; };
+  if (shape == Shape::votes) return offerTo(chain.votes);
+  if (shape == Shape::changedVotes) return offerTo(chain.changedVotes);
+  return shape == Shape::decisions ? offerTo(chain.decisions) : offerTo(chain.changedDecisions);
+}
+
+template <class Last>
+int SessionActivity::deliver(Last& last, void** out, int* outLen) {
+  const auto delivered = static_cast<size_t>(last.length());
   const size_t bytes = delivered * ActivityDecision::kSize;
   storeU16(work, kValueOffset, static_cast<uint16_t>(delivered));
-  copyBytes<ActivityDecision::kSize>(work.data() + kHeaderSize, shape.buffer(), bytes);
+  copyBytes<ActivityDecision::kSize>(work.data() + kHeaderSize, last.buffer(), bytes);
   *out = work.data();
   *outLen = static_cast<int>(kHeaderSize + bytes);
-  shape.reset();
+  last.reset();
   return 1;
 }
 

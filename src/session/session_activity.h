@@ -4,7 +4,6 @@
 #include <cstdint>
 #include <memory>
 #include <span>
-#include <variant>
 
 #include "bytes.h"
 #include "option/option_activity.h"
@@ -44,17 +43,32 @@ class SessionActivity final : public SessionOf<OptionActivity> {
   using Batch = ProcNM<ActivityDecision::kSize>;
   using Decisions = ProcMask<Batch, _activity_mask_func>;
   using Votes = ProcMask<ProcMixerActivity<Batch>, _activity_mask_func>;
-  using Chain = std::variant<Decisions, Votes, ProcChange<Decisions, _activity_equal_func>,
-                             ProcChange<Votes, _activity_equal_func>>;
+  using ChangedDecisions = ProcChange<Decisions, _activity_equal_func>;
+  using ChangedVotes = ProcChange<Votes, _activity_equal_func>;
 
   static constexpr int kMostDecisions = 256;  // the largest batch: 1 << the largest logN
 
-  Chain makeChain(std::span<uint8_t> batch) const;
+  void makeChain(std::span<uint8_t> batch);
+  // Offers decisions to the chain. Returns 1 with its result, 0 when it has none.
+  [[gnu::always_inline]] int offer(const uint8_t* decisions, int count, void** out, int* outLen);
+  // Offers what is in `work` once more.
+  [[gnu::noinline]] int repeat(void** out, int* outLen);
   // Hands out the chain's result. Out of line: most records deliver nothing.
-  template <class Shape>
-  [[gnu::noinline]] int deliver(Shape& shape, void** out, int* outLen);
+  template <class Last>
+  [[gnu::noinline]] int deliver(Last& last, void** out, int* outLen);
 
-  Chain chain;                        // in force when `proc` points at it
+  // All trivial, so that one can be made in the place of another.
+  union Chain {
+    Decisions decisions;
+    ChangedDecisions changedDecisions;
+    Votes votes;
+    ChangedVotes changedVotes;
+    Chain() : decisions() {}
+  };
+  enum class Shape { decisions, changedDecisions, votes, changedVotes };
+
+  Chain chain;  // of this shape, once `proc` points at it
+  Shape shape = Shape::decisions;
   std::unique_ptr<uint8_t[]> memory;  // of the batch
   size_t memorySize = 0;
   std::array<uint8_t, 10 + 2 * kMostDecisions> work{};  // the last record, or the last result made of it

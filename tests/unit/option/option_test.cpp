@@ -8,6 +8,7 @@
 #include <ostream>
 #include <vector>
 
+#include "library_memory.h"
 #include "option/option.h"
 
 namespace senseloom {
@@ -56,9 +57,11 @@ TEST(PropertyLists, NewListOfNoEntriesIsAList) {
   EXPECT_EQ(list->count, 0);
 }
 
-TEST(PropertyLists, NewListOfANegativeCountIsNull) {
+TEST(PropertyLists, NewListOfANegativeCountIsNullAndTakesNoMemory) {
+  const memory::AllocationCount allocations;
   EXPECT_EQ(Option::newOption(-1), nullptr);
   EXPECT_EQ(Option::newOption(std::numeric_limits<int>::min()), nullptr);
+  EXPECT_EQ(allocations.made(), 0U);
 }
 
 #if UINTPTR_MAX == UINT32_MAX

@@ -18,7 +18,7 @@ using Decisions = std::vector<uint16_t>;
 // The result for a batch of all the decisions.
 int vote(const Decisions& decisions, int weightVar) {
   Bytes memory(2 * decisions.size());
-  ProcMixerActivity<ProcNM<2>> stage{ProcNM<2>(memory), ActivityVote(weightVar)};
+  ProcMixerActivity<ProcNM<2>> stage{ActivityVote(weightVar), std::span<uint8_t>(memory)};
   EXPECT_TRUE(stage.accept(decisions.data(), static_cast<int>(decisions.size())));
   return loadU16({stage.buffer(), 2}, 0);
 }

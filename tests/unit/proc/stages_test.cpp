@@ -116,7 +116,7 @@ using Mask = ProcMask<FakeStage, maskLetter>;
 TEST(MaskStage, RewritesEveryElementOfACompleteBatchInPlaceAndDoesNotResetIt) {
   Before before = complete("abcd");
   before.length = 3;
-  Mask stage({&before}, 1);
+  Mask stage(1, FakeStage{&before});
   EXPECT_TRUE(stage.accept("data", 7));
   EXPECT_EQ(before.batch, "bcdd") << "the elements that there are, and no more";
   EXPECT_EQ(before.events, Events{"data of 7"});
@@ -130,7 +130,7 @@ TEST(MaskStage, RewritesEveryElementOfACompleteBatchInPlaceAndDoesNotResetIt) {
 TEST(MaskStage, WaitsForTheBatch) {
   Before before = complete("abcd");
   before.completes = false;
-  Mask stage({&before}, 1);
+  Mask stage(1, FakeStage{&before});
   EXPECT_FALSE(stage.accept("data", 1));
   EXPECT_EQ(before.batch, "abcd");
 }
@@ -213,7 +213,7 @@ TEST(MixingStage, MixesACompleteBatchIntoOneElementAndRefusesMoreUntilItIsReset)
   Before before = complete("abcd");
   before.length = 2;
   int mixes = 0;
-  ProcMixer<FakeStage, CountMix> stage({&before}, {&mixes});
+  ProcMixer<FakeStage, CountMix> stage(CountMix{&mixes}, FakeStage{&before});
   EXPECT_EQ(stage.length(), 0);
   EXPECT_TRUE(stage.accept("data", 9));
   EXPECT_EQ(*stage.buffer(), '4') << "a previous stage that completes with fewer elements counts with all its room";
@@ -231,7 +231,7 @@ TEST(MixingStage, WithoutACompleteBatchHasNoResult) {
   int mixes = 0;
   Before before = complete("");
   before.completes = false;
-  ProcMixer<FakeStage, CountMix> stage({&before}, {&mixes});
+  ProcMixer<FakeStage, CountMix> stage(CountMix{&mixes}, FakeStage{&before});
   EXPECT_FALSE(stage.accept("data", 1));
   EXPECT_EQ(stage.length(), 0) << "of a stage before that has no room, too";
   EXPECT_EQ(mixes, 0);
@@ -239,7 +239,7 @@ TEST(MixingStage, WithoutACompleteBatchHasNoResult) {
 
 TEST(PedoMixer, KeepsTheMostRecentCountOfABatch) {
   std::vector<uint8_t> memory(12);
-  ProcMixerPedo<ProcNM<4>> stage(ProcNM<4>(memory), {});
+  ProcMixerPedo<ProcNM<4>> stage{LatestCount{}, std::span<uint8_t>(memory)};
   const int32_t counts[] = {7, -8, 0x01020304};
   EXPECT_FALSE(stage.accept(counts, 2));
   EXPECT_TRUE(stage.accept(counts + 2, 1));
@@ -261,14 +261,14 @@ struct ShortStage {
 
 TEST(PedoMixer, KeepsTheLastCountThatThereIs) {
   using Stage = ShortStage<int32_t, 2>;
-  ProcMixerPedo<Stage> stage(Stage{{7, 8, 9}}, {});
+  ProcMixerPedo<Stage> stage(LatestCount{}, Stage{{7, 8, 9}});
   EXPECT_TRUE(stage.accept("data", 1));
   EXPECT_EQ(loadI32({stage.buffer(), 4}, 0), 8);
 }
 
 TEST(ActivityMixer, CountsAllTheRoomOfTheStageBefore) {
   using Stage = ShortStage<uint16_t, 2>;
-  ProcMixerActivity<Stage> stage(Stage{{0x51, 0x62, 0x72}}, ActivityVote(-1));
+  ProcMixerActivity<Stage> stage(ActivityVote(-1), Stage{{0x51, 0x62, 0x72}});
   EXPECT_TRUE(stage.accept("data", 1));
   EXPECT_EQ(loadU16({stage.buffer(), 2}, 0), 0x52)
       << "two of three; of the first two alone no class has more than half";
