@@ -64,6 +64,7 @@ class Rebuild:
         moved = re.sub(rf"{re.escape(self.root)}(?=[/ ])(?!/{re.escape(os.path.relpath(self.build, self.root))}/)",
                        self.tree, command)
         moved = re.sub(r" -MD -MT \S+ -MF \S+", "", moved)
+        moved = re.sub(r" -Winvalid-pch| -include \S+/cmake_pch\.hxx", "", moved)  # precompiled for other sources
         arguments = [str(made) if argument == name else argument for argument in shlex.split(moved)]
         plain = ["-O0"] + (["-U_FORTIFY_SOURCE"] if "_FORTIFY_SOURCE" in command else [])  # which takes optimisation
         self._run([*arguments, *plain])
