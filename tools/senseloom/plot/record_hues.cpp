@@ -4,7 +4,7 @@
 #include <cstdlib>
 #include <optional>
 
-#include "trace/record_field.h"
+#include "trace/record_value.h"
 
 namespace senseloom::tool {
 namespace {
@@ -18,12 +18,6 @@ RecordHues oneOf(size_t hue) {
 RecordHues ofClass(int32_t classNumber) {
   return oneOf(classNumber >= 0 && classNumber < static_cast<int32_t>(kOtherHue) ? static_cast<size_t>(classNumber)
                                                                                  : kOtherHue);
-}
-
-// The integer of the head; nothing when the record is too short for it.
-std::optional<int32_t> valueOf(const Sensor& sensor, std::span<const uint8_t> record) {
-  if (sensor.valueSize == sizeof(int32_t)) return recordField<int32_t>(record, kValueOffset);
-  return recordField<int16_t>(record, kValueOffset);
 }
 
 RecordHues ofDecisions(std::span<const uint8_t> record) {
@@ -62,7 +56,7 @@ void RecordHues::add(const RecordHues& other) {
 
 RecordHues huesOf(const Sensor& sensor, std::span<const uint8_t> record, bool isResult) {
   if (sensor.items == Items::decisions) return ofDecisions(record);
-  const auto value = valueOf(sensor, record);
+  const auto value = recordValue(sensor, record);
   if (sensor.shown == Shown::amount) return ofAmount(value.value_or(0));
   // What a record has in the place of its result's class is not a class.
   if (!value || (sensor.resultValue != nullptr && !isResult)) return oneOf(kPlainHue);

@@ -25,8 +25,6 @@ class ReplayPlot final : public ReplayObserver {
   void onEnd() override;
 
  private:
-  void write() const;
-
   std::unique_ptr<ReplayObserver> output;
   const std::string title;
   const PlotArguments arguments;

@@ -7,6 +7,7 @@
 #include <utility>
 
 #include "kinds/option_data.h"
+#include "plot/svg_canvas.h"
 #include "plot/svg_lane.h"
 #include "plot/svg_text.h"
 
@@ -25,14 +26,7 @@ constexpr double kCharacter = 5.9;  // about the width of one, to keep texts apa
 constexpr size_t kMostNameCharacters = 18;
 constexpr int kMostAxisMarks = 8;
 
-// Both palettes: the hues, and everything else that has a colour.
-struct ColourRow {
-  const char* selector;
-  const char* property;
-  const char* light;
-  const char* dark;
-};
-constexpr ColourRow kColours[] = {
+constexpr SvgColour kColours[] = {
     {".back", "fill", "#ffffff", "#0d1117"},   {"text", "fill", "#1f2328", "#e6edf3"},
     {".quiet", "fill", "#59636e", "#9198a1"},  {".note", "fill", "#59636e", "#9198a1"},
     {".note", "stroke", "#ffffff", "#0d1117"}, {".open", "fill", "#eff2f5", "#21262d"},
@@ -46,20 +40,9 @@ constexpr ColourRow kColours[] = {
     {".h9", "fill", "#6b7a8c", "#8795a8"},
 };
 
-std::string style() {
-  std::string light;
-  std::string dark;
-  for (const ColourRow& row : kColours) {
-    const std::string begin = std::string(row.selector) + '{' + row.property + ':';
-    light += begin + row.light + '}';
-    dark += begin + row.dark + '}';
-  }
-  return "<style>text{font:12px system-ui,-apple-system,\"Segoe UI\",Roboto,\"DejaVu Sans\",sans-serif}"
-         ".head{font-size:15px;font-weight:600}.name{font-weight:600}.small{font-size:11px}"
-         ".axis,.cut,.tick,.no{fill:none}.cut{stroke-dasharray:2 3;stroke-opacity:.7}.no{stroke-width:1.6}"
-         ".note{paint-order:stroke;stroke-width:4;stroke-linejoin:round}\n" +
-         light + "\n@media (prefers-color-scheme:dark){" + dark + "}</style>\n";
-}
+constexpr char kRules[] =
+    ".axis,.cut,.tick,.no{fill:none}.cut{stroke-dasharray:2 3;stroke-opacity:.7}.no{stroke-width:1.6}"
+    ".note{paint-order:stroke;stroke-width:4;stroke-linejoin:round}";
 
 class Picture {
  public:
@@ -67,38 +50,26 @@ class Picture {
 
   std::string draw(const std::string& title) {
     y = kMargin + 12;
-    addText(kMargin, y, "head", title);
-    addText(kWidth - kRight, y, "quiet", "the records of a sensor, and what each client received of them", "end");
+    canvas.addText(kMargin, y, "head", title);
+    canvas.addText(kWidth - kRight, y, "quiet", "the records of a sensor, and what each client received of them",
+                   "end");
     y += 10;
     for (const Plot::Group& group : plot.sensorGroups()) addGroup(group);
     addAxis();
     addKey();
     y = std::ceil(y);
-    const std::string size = coordinate(kWidth) + ' ' + coordinate(y);
-    return "<svg xmlns=\"http://www.w3.org/2000/svg\" viewBox=\"0 0 " + size + "\" width=\"" + coordinate(kWidth) +
-           "\" height=\"" + coordinate(y) + "\" role=\"img\">\n<title>" + xmlText(title) + "</title>\n" + style() +
-           "<rect class=\"back\" width=\"100%\" height=\"100%\"/>\n" + body + "</svg>\n";
+    return canvas.document(title, kWidth, y, kRules, kColours);
   }
 
  private:
   static double laneWidth() { return kWidth - kLeft - kRight; }
   double xOf(size_t bin) const { return kLeft + laneWidth() * plot.time().placeOf(bin); }
 
-  void addText(double x, double baseline, const char* classes, std::string_view text, const char* anchor = "start") {
-    body += "<text x=\"" + coordinate(x) + "\" y=\"" + coordinate(baseline) + "\" class=\"" + classes + '"';
-    if (std::string_view(anchor) != "start") body += std::string(" text-anchor=\"") + anchor + '"';
-    body += '>' + xmlText(text) + "</text>\n";
-  }
-
-  void addPath(const char* classes, const std::string& path) {
-    if (!path.empty()) body += std::string("<path class=\"") + classes + "\" d=\"" + path + "\"/>\n";
-  }
-
   void addGroup(const Plot::Group& group) {
     const Sensor& sensor = *group.sensor;
     y += 22;
-    addText(kMargin, y, "name", group.sensor->name);
-    addText(kMargin + 60, y, "quiet", findOptionDescription(group.sensor->name)->title);
+    canvas.addText(kMargin, y, "name", group.sensor->name);
+    canvas.addText(kMargin + 60, y, "quiet", findOptionDescription(group.sensor->name)->title);
     addLegend(group, sensor);
     y += 14;
     const double top = y;
@@ -108,7 +79,7 @@ class Picture {
       for (size_t bin = 0; bin < Timeline::kBins; ++bin) most = std::max(most, client.at(bin).received.height);
     }
     addNames("records", grouped(group.records.offered), y + kRecordsHeight / 2);
-    body += SvgLane(plot.time(), sensor, {kLeft, y, laneWidth(), kRecordsHeight}).draw(group.records, most);
+    canvas.add(SvgLane(plot.time(), sensor, {kLeft, y, laneWidth(), kRecordsHeight}).draw(group.records, most));
     y += kRecordsHeight + 4;
     for (const PlotLane& client : group.clients) addClient(client, sensor, most);
     addNegotiations(group.records, top, y);
@@ -132,23 +103,23 @@ class Picture {
         x = left;
         y += 18;
       }
-      body += "<rect class=\"" + hueClass(hue) + "\" x=\"" + coordinate(x) + "\" y=\"" + coordinate(y - 10) +
-              "\" width=\"11\" height=\"11\" rx=\"2\"/>\n";
-      addText(x + 16, y, "small", text);
+      canvas.add("<rect class=\"" + hueClass(hue) + "\" x=\"" + coordinate(x) + "\" y=\"" + coordinate(y - 10) +
+                 "\" width=\"11\" height=\"11\" rx=\"2\"/>\n");
+      canvas.addText(x + 16, y, "small", text);
       x += width;
     }
   }
 
   void addNames(const std::string& name, const std::string& detail, double middle) {
-    addText(kMargin, middle - 2, "name", shortened(name, kMostNameCharacters));
-    addText(kMargin, middle + 12, "quiet small", detail);
+    canvas.addText(kMargin, middle - 2, "name", shortened(name, kMostNameCharacters));
+    canvas.addText(kMargin, middle + 12, "quiet small", detail);
   }
 
   void addClient(const PlotLane& client, const Sensor& sensor, uint32_t most) {
     y += kNoteHeight;
     addNames(client.name, grouped(client.results) + " of " + grouped(client.offered), y + kClientHeight / 2);
     addPresence(client);
-    body += SvgLane(plot.time(), sensor, {kLeft, y, laneWidth(), kClientHeight}).draw(client, most);
+    canvas.add(SvgLane(plot.time(), sensor, {kLeft, y, laneWidth(), kClientHeight}).draw(client, most));
     if (sensor.lasts) addResultTicks(client);
     y += kClientStride - kNoteHeight;
   }
@@ -158,8 +129,8 @@ class Picture {
     double from = -1;
     const auto end = [&](double to) {
       if (from >= 0 && to > from) {
-        body += "<rect class=\"open\" x=\"" + coordinate(from) + "\" y=\"" + coordinate(y) + "\" width=\"" +
-                coordinate(to - from) + "\" height=\"" + coordinate(kClientHeight) + "\"/>\n";
+        canvas.add("<rect class=\"open\" x=\"" + coordinate(from) + "\" y=\"" + coordinate(y) + "\" width=\"" +
+                   coordinate(to - from) + "\" height=\"" + coordinate(kClientHeight) + "\"/>\n");
       }
       from = -1;
     };
@@ -177,7 +148,7 @@ class Picture {
       if (client.at(bin).received.records == 0) continue;
       ticks += 'M' + coordinate(xOf(bin)) + ' ' + coordinate(y + kClientHeight + 1) + "v4";
     }
-    addPath("tick", ticks);
+    canvas.addPath("tick", ticks);
   }
 
   // What the client asks for, at the time it does. A text that would run into the one before it is left out.
@@ -190,7 +161,7 @@ class Picture {
       const bool fits = x + 9 + width < kWidth - 4;
       const double left = fits ? x + 9 : x - 9 - width;
       if (left < end || left < kLeft - 4) continue;
-      addText(fits ? x + 9 : x - 9, y - 5, "note small", note.text, fits ? "start" : "end");
+      canvas.addText(fits ? x + 9 : x - 9, y - 5, "note small", note.text, fits ? "start" : "end");
       end = left + width + 12;
     }
     std::string taken;
@@ -204,8 +175,8 @@ class Picture {
         taken += 'M' + at + coordinate(y - 14) + "l5 5-5 5-5-5z";
       }
     }
-    addPath("ask", taken);
-    addPath("no", refused);
+    canvas.addPath("ask", taken);
+    canvas.addPath("no", refused);
     y += kClientStride - kNoteHeight;
   }
 
@@ -215,7 +186,7 @@ class Picture {
       if (!records.at(bin).negotiates) continue;
       lines += 'M' + coordinate(xOf(bin)) + ' ' + coordinate(top - 3) + 'V' + coordinate(bottom - 3);
     }
-    addPath("cut", lines);
+    canvas.addPath("cut", lines);
   }
 
   void addAxis() {
@@ -228,10 +199,10 @@ class Picture {
     for (double value = std::ceil(time.first() / step) * step; value <= time.last(); value += step) {
       const double x = kLeft + laneWidth() * (value - time.first()) / span;
       marks += 'M' + coordinate(x) + ' ' + coordinate(y) + "v5";
-      addText(x, y + 18, "quiet small", grouped(static_cast<uint64_t>(value)), "middle");
+      canvas.addText(x, y + 18, "quiet small", grouped(static_cast<uint64_t>(value)), "middle");
     }
-    addPath("axis", marks);
-    addText(kMargin, y + 18, "quiet small", time.isTime() ? "timestamp" : "record");
+    canvas.addPath("axis", marks);
+    canvas.addText(kMargin, y + 18, "quiet small", time.isTime() ? "timestamp" : "record");
     y += 18;
   }
 
@@ -254,43 +225,42 @@ class Picture {
     y += 26;
     double x = kLeft;
     const auto explain = [&](const char* text) {
-      addText(x + 12, y, "quiet small", text);
+      canvas.addText(x + 12, y, "quiet small", text);
       x += 12 + kCharacter * static_cast<double>(std::string_view(text).size()) + 22;
     };
     if (anyBin([](const PlotLane::Bin& bin) { return bin.asks && !bin.isRefused; })) {
-      addPath("ask", 'M' + coordinate(x + 2) + ' ' + coordinate(y - 9) + "l5 5-5 5-5-5z");
+      canvas.addPath("ask", 'M' + coordinate(x + 2) + ' ' + coordinate(y - 9) + "l5 5-5 5-5-5z");
       explain("an option is set");
     }
     if (anyBin([](const PlotLane::Bin& bin) { return bin.isRefused; })) {
-      addPath("no", 'M' + coordinate(x - 2) + ' ' + coordinate(y - 8) + "l8 8m0-8l-8 8");
+      canvas.addPath("no", 'M' + coordinate(x - 2) + ' ' + coordinate(y - 8) + "l8 8m0-8l-8 8");
       explain("an option is refused");
     }
     if (anyBin([](const PlotLane::Bin& bin) { return bin.negotiates; })) {
-      addPath("cut", 'M' + coordinate(x + 2) + ' ' + coordinate(y - 11) + "v14");
+      canvas.addPath("cut", 'M' + coordinate(x + 2) + ' ' + coordinate(y - 11) + "v14");
       explain("the sensor negotiates");
     }
     if (std::any_of(groups.begin(), groups.end(), [](auto& group) { return group.sensor->lasts; })) {
-      addPath("tick", 'M' + coordinate(x + 2) + ' ' + coordinate(y - 7) + "v5");
+      canvas.addPath("tick", 'M' + coordinate(x + 2) + ' ' + coordinate(y - 7) + "v5");
       explain("a result arrives");
     }
-    body += "<rect class=\"open\" x=\"" + coordinate(x - 4) + "\" y=\"" + coordinate(y - 9) +
-            "\" width=\"12\" height=\"11\"/>\n";
+    canvas.add("<rect class=\"open\" x=\"" + coordinate(x - 4) + "\" y=\"" + coordinate(y - 9) +
+               "\" width=\"12\" height=\"11\"/>\n");
     explain("the session is open");
-    if (plot.isCut()) addText(kWidth - kRight, y, "quiet small", "more clients are not shown", "end");
+    if (plot.isCut()) canvas.addText(kWidth - kRight, y, "quiet small", "more clients are not shown", "end");
     y += kMargin;
   }
 
   const Plot& plot;
   const std::vector<std::string>& classNames;
-  std::string body;
+  SvgCanvas canvas;
   double y = 0;  // down to where the picture is drawn
 };
 
 }  // namespace
 
-void writeSvg(std::FILE* out, const Plot& plot, const std::string& title, const std::vector<std::string>& names) {
-  const std::string text = Picture(plot, names).draw(title);
-  std::fwrite(text.data(), 1, text.size(), out);
+std::string drawSvg(const Plot& plot, const std::string& title, const std::vector<std::string>& names) {
+  return Picture(plot, names).draw(title);
 }
 
 }  // namespace senseloom::tool

@@ -1,6 +1,5 @@
 #pragma once
 
-#include <cstdio>
 #include <string>
 #include <vector>
 
@@ -8,8 +7,8 @@
 
 namespace senseloom::tool {
 
-// Writes a plot as a self-contained SVG file, on a light or a dark ground as the viewer prefers. `names` are the names
+// A plot as a self-contained SVG file, on a light or a dark ground as the viewer prefers. `names` are the names
 // of the classes from 0 on, as far as they have any.
-void writeSvg(std::FILE* out, const Plot& plot, const std::string& title, const std::vector<std::string>& names);
+std::string drawSvg(const Plot& plot, const std::string& title, const std::vector<std::string>& names);
 
 }  // namespace senseloom::tool
