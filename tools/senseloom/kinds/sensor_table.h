@@ -44,6 +44,11 @@ struct Sensor {
   int32_t noMajorityClass = -1;  // the class that the library makes itself, for want of a majority
 };
 
+// Whether its results have classes.
+constexpr bool hasClasses(const Sensor& sensor) {
+  return sensor.shown != Shown::amount;
+}
+
 // Null if there is no such sensor.
 const Sensor* findSensor(std::string_view name);
 // Throws InputError if there is no such sensor.

@@ -109,6 +109,7 @@ TraceCall readCall(const Json& object) {
     case CallKind::dispatch:
       readTarget(object, call);
       call.record = recordMember(object);
+      call.truth = Json(json_incref(json_object_get(object.get(), member::kTruth)));
       break;
     case CallKind::close:
       call.session = sessionMember(object);

@@ -19,6 +19,7 @@ struct TraceCall {
   std::optional<std::string> option;  // of a set_option; nothing: a null pointer
   Json record;                        // of a dispatch
   Json recorded;                      // what a recording says of its outcome; null: nothing
+  Json truth;                         // of a dispatch: the member of that name, whatever it is; null: there is none
 };
 
 // Whether a line's object is a note for readers, with no call.

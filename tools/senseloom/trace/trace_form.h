@@ -27,6 +27,10 @@ inline constexpr char kSensor[] = "sensor";
 inline constexpr char kOption[] = "option";
 inline constexpr char kOptionHex[] = "optionHex";
 inline constexpr char kRecord[] = "record";
+inline constexpr char kTruth[] = "truth";
+
+// A note.
+inline constexpr char kTimeUnit[] = "timeUnit";
 
 // What came of it.
 inline constexpr char kReturned[] = "returned";

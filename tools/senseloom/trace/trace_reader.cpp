@@ -8,6 +8,7 @@
 #include <string_view>
 
 #include "input_error.h"
+#include "trace/time_unit.h"
 
 namespace senseloom::tool {
 
@@ -26,10 +27,12 @@ TraceReader::TraceReader(const std::string& file)
 
 std::optional<TraceCall> TraceReader::next() {
   Json object;
-  do {
+  while (true) {
     object = nextObject();
     if (object == nullptr) return std::nullopt;
-  } while (isNote(object));
+    if (!isNote(object)) break;
+    readNote(object);
+  }
 
   TraceCall call = readCall(object);
   call.line = lineNumber;
@@ -44,6 +47,13 @@ uint64_t TraceReader::size() const {
   struct stat file {};
   if (fstat(fileno(stream.get()), &file) != 0 || !S_ISREG(file.st_mode)) return 0;
   return static_cast<uint64_t>(file.st_size);
+}
+
+void TraceReader::readNote(const Json& note) {
+  const json_t* said = json_object_get(note.get(), member::kTimeUnit);
+  if (said == nullptr) return;
+  if (!json_is_string(said)) throw InputError("\"timeUnit\" must be a string");
+  unit = timeUnitNamed(json_string_value(said));
 }
 
 // The object on the next line that is not blank; null at the end.

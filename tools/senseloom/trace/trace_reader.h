@@ -22,8 +22,14 @@ class TraceReader {
   // The next call, or nothing at the end. Throws InputError when there is none on a line that is not blank.
   std::optional<TraceCall> next();
 
+  // How long a unit of the timestamps is, in nanoseconds, if a note so far says so.
+  std::optional<int64_t> timeUnit() const { return unit; }
+
   // Where the last line was read, for messages: "FILE:LINE", or the file alone before the first one.
   std::string position() const;
+
+  // The file, for messages.
+  const std::string& fileName() const { return name; }
 
   uint64_t bytesRead() const { return byteCount; }
   // Bytes of the whole trace; 0 when it is not a file.
@@ -38,6 +44,7 @@ class TraceReader {
   };
 
   Json nextObject();
+  void readNote(const Json& note);
   bool readLine();
 
   std::string name;
@@ -47,6 +54,7 @@ class TraceReader {
   size_t lineLength = 0;
   size_t lineNumber = 0;
   uint64_t byteCount = 0;
+  std::optional<int64_t> unit;
 };
 
 }  // namespace senseloom::tool
