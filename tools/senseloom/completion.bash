@@ -1,6 +1,10 @@
 # Completion of senseloom's command line for bash.
 # shellcheck shell=bash
 
+_senseloom_sensors() {
+  "${COMP_WORDS[0]}" sensors --json 2>/dev/null | sed 's/^{"sensor":"\([^"]*\)".*/\1/'
+}
+
 _senseloom() {
   # Options of each command, and what else may follow it. Where nothing of that fits, a file may.
   local -A options=(
@@ -10,10 +14,11 @@ _senseloom() {
     [record]="--help --output"
     [generate]="--help"
     [generate commute]="--help --seed --records"
+    [convert]="--help --from --columns --sensor --time-unit --output"
     [sensors]="--help --json"
   )
   local -A words=(
-    [senseloom]="replay explain record generate sensors"
+    [senseloom]="replay explain record generate convert sensors"
     [generate]="commute"
   )
   local current=${COMP_WORDS[COMP_CWORD]} command="" candidates longer word
@@ -26,13 +31,16 @@ _senseloom() {
   case ${COMP_WORDS[COMP_CWORD - 1]} in
     --log) candidates="debug info warn error none" ;;
     --output | -o | --plot) return ;; # a file
-    --seed | --class-names) return ;; # whatever one likes
+    --seed | --class-names | --columns) return ;; # whatever one likes
+    --time-unit) candidates="s ms us ns" ;;
+    --from) candidates="csv" ;;
+    --sensor) candidates=$(_senseloom_sensors) ;;
     --) candidates=$(compgen -c) ;;
     *)
       if [[ $current == -* ]]; then
         candidates=${options[$command]}
       elif [[ $command == explain || $command == sensors ]]; then
-        candidates=$("${COMP_WORDS[0]}" sensors --json 2>/dev/null | sed 's/^{"sensor":"\([^"]*\)".*/\1/')
+        candidates=$(_senseloom_sensors)
       else
         candidates=${words[$command]-}
       fi

@@ -10,6 +10,7 @@
 #include <string>
 
 #include "command.h"
+#include "convert/convert_command.h"
 #include "explain/explain_arguments.h"
 #include "generate/generate_command.h"
 #include "input_error.h"
@@ -21,7 +22,8 @@ namespace senseloom::tool {
 namespace {
 
 // In the order of the help.
-constexpr Declare* kCommands[] = {declareReplay, declareExplain, declareRecord, declareGenerate, declareSensors};
+constexpr Declare* kCommands[] = {declareReplay,   declareExplain, declareRecord,
+                                  declareGenerate, declareConvert, declareSensors};
 
 constexpr int kFailure = 1;
 constexpr int kBadInput = 2;
