@@ -14,11 +14,12 @@ _senseloom() {
     [record]="--help --output"
     [generate]="--help"
     [generate commute]="--help --seed --records"
+    [sweep]="--help --session --sensor --option --set --truth --time-unit --sort --reverse --best --limit --json --plot --at-most-false --at-most-delay"
     [convert]="--help --from --columns --sensor --time-unit --output"
     [sensors]="--help --json"
   )
   local -A words=(
-    [senseloom]="replay explain record generate convert sensors"
+    [senseloom]="replay explain record sweep generate convert sensors"
     [generate]="commute"
   )
   local current=${COMP_WORDS[COMP_CWORD]} command="" candidates longer word
@@ -30,8 +31,8 @@ _senseloom() {
 
   case ${COMP_WORDS[COMP_CWORD - 1]} in
     --log) candidates="debug info warn error none" ;;
-    --output | -o | --plot) return ;; # a file
-    --seed | --class-names | --columns) return ;; # whatever one likes
+    --output | -o | --plot | --truth) return ;; # a file
+    --seed | --class-names | --session | --option | --set | --sort | --limit | --columns | --at-most-*) return ;; # whatever one likes
     --time-unit) candidates="s ms us ns" ;;
     --from) candidates="csv" ;;
     --sensor) candidates=$(_senseloom_sensors) ;;

@@ -17,12 +17,13 @@
 #include "record/record_command.h"
 #include "replay/replay_command.h"
 #include "sensors/sensors_command.h"
+#include "sweep/sweep_command.h"
 
 namespace senseloom::tool {
 namespace {
 
 // In the order of the help.
-constexpr Declare* kCommands[] = {declareReplay,   declareExplain, declareRecord,
+constexpr Declare* kCommands[] = {declareReplay,   declareExplain, declareRecord, declareSweep,
                                   declareGenerate, declareConvert, declareSensors};
 
 constexpr int kFailure = 1;
