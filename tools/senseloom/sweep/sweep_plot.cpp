@@ -47,10 +47,10 @@ class Axis {
   // Round values, not too close to each other.
   std::vector<double> marks() const {
     std::vector<double> values{0};
-    const double step = std::pow(10, std::floor(std::log10(most)) - 2);
-    for (double unit = step; unit <= most; unit *= 10) {
+    const int highest = static_cast<int>(std::floor(std::log10(most)));
+    for (int power = highest - 2; power <= highest; ++power) {
       for (const double factor : {1, 2, 5}) {
-        const double value = unit * factor;
+        const double value = factor * std::pow(10, power);
         const double room = std::abs(at(value) - at(values.back()));
         if (value <= most && room >= std::abs(extent) / (2 * kMostMarks)) values.push_back(value);
       }
