@@ -63,7 +63,7 @@ class SessionActivity final : public SessionOf<OptionActivity> {
     ChangedDecisions changedDecisions;
     Votes votes;
     ChangedVotes changedVotes;
-    Chain() : decisions() {}
+    Chain() : decisions(0) {}
   };
   enum class Shape { decisions, changedDecisions, votes, changedVotes };
 

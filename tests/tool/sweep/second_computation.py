@@ -96,66 +96,78 @@ def opened_anew(records, before, after):
     return records[before][2] != records[after][2]
 
 
-def figures(traces, option, per_second):
-    """The figures, as the definitions say."""
-    hours = known = right = labelled = 0
-    count = dict.fromkeys(RATES, 0)
-    changes, missed, delays, waits = 0, 0, [], []
-    for calls in traces:
-        records, results = replay(calls, option)
+class Tally:
+    """What is counted over all traces."""
+
+    def __init__(self):
+        self.hours = self.known = self.right = self.labelled = 0
+        self.count = dict.fromkeys(RATES, 0)
+        self.changes, self.missed, self.delays, self.waits = 0, 0, [], []
+
+    def add(self, records, results, per_second):
         labels = [label for _, label, _ in records]
         times = [time / per_second for time, _, _ in records]
         stays = [times[i + 1] - times[i] if not opened_anew(records, i, i + 1) else 0 for i in range(len(times) - 1)]
-        known = known or any(labels)
-        hours += sum(stays) / 3600
 
         def held(before):
             """The class of the last result up to a record."""
             past = [c for at, c, _ in results if at <= before and c is not None]
             return past[-1] if past else None
 
-        count["results_per_hour"] += len(results)
-        waits += [times[at] - times[batch[0]] for at, _, batch in results]
+        self.known = self.known or any(labels)
+        self.hours += sum(stays) / 3600
+        self.waits += [times[at] - times[batch[0]] for at, _, batch in results]
+        self.labelled += sum(stay for stay, label in zip(stays, labels) if label)
+        self.right += sum(stay for i, (stay, label) in enumerate(zip(stays, labels)) if label and held(i) == label)
+        self.add_reports(labels, results, held)
+        self.add_changes(labels, times, results, held)
+
+    def add_reports(self, labels, results, held):
+        self.count["results_per_hour"] += len(results)
         for at, c, batch in results:
-            count["no_majority_per_hour"] += c == 6
+            self.count["no_majority_per_hour"] += c == 6
             earlier = held(at - 1)
             if c is None or earlier is None or c == earlier:
                 continue
-            count["reports_per_hour"] += 1
+            self.count["reports_per_hour"] += 1
             batch_labels = [labels[i] for i in batch]
-            count["false_per_hour"] += c != 6 and all(batch_labels) and c not in batch_labels
+            self.count["false_per_hour"] += c != 6 and all(batch_labels) and c not in batch_labels
 
-        labelled += sum(stay for stay, label in zip(stays, labels) if label)
-        right += sum(stay for i, (stay, label) in enumerate(zip(stays, labels)) if label and held(i) == label)
-
+    def add_changes(self, labels, times, results, held):
         for i, label in enumerate(labels):
             before = [other for other in labels[:i] if other]
             if not label or not before or before[-1] == label:
                 continue
-            changes += 1
+            self.changes += 1
             others = [j for j in range(i, len(labels)) if labels[j] not in (0, label)]
             end = max(j for j in range(i, others[0] if others else len(labels)) if labels[j] == label)
             heard = [at for at, c, _ in results if i <= at <= end and c == label]
             if held(i - 1) == label:
-                delays.append(0)
+                self.delays.append(0)
             elif heard:
-                delays.append(times[heard[0]] - times[i])
+                self.delays.append(times[heard[0]] - times[i])
             else:
-                missed += 1
+                self.missed += 1
 
-    found = {name: (value / hours if hours else None) for name, value in count.items()}
-    delays.sort()
+
+def figures(traces, option, per_second):
+    """The figures, as the definitions say."""
+    tally = Tally()
+    for calls in traces:
+        tally.add(*replay(calls, option), per_second)
+    delays = sorted(tally.delays)
+    found = {name: (value / tally.hours if tally.hours else None) for name, value in tally.count.items()}
     found |= {
-        "changes": changes,
-        "missed": missed,
+        "changes": tally.changes,
+        "missed": tally.missed,
         "delay_median_s": statistics.median(delays) if delays else None,
         "delay_p90_s": delays[math.ceil(len(delays) * 9 / 10) - 1] if delays else None,
-        "right": right / labelled if labelled else None,
+        "right": tally.right / tally.labelled if tally.labelled else None,
     }
-    if not known:
+    if not tally.known:
         for name in ("false_per_hour", "changes", "missed", "delay_median_s", "delay_p90_s", "right"):
             found[name] = None
-        found["batch_median_s"] = statistics.median(waits) if waits else None
+        found["batch_median_s"] = statistics.median(tally.waits) if tally.waits else None
     return found
 
 

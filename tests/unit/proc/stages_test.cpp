@@ -275,7 +275,7 @@ TEST(ActivityMixer, CountsAllTheRoomOfTheStageBefore) {
 }
 
 TEST(ActivityMixer, OverAStageWithoutRoomHasNoResult) {
-  ProcMixerActivity<ProcNM<2>> stage;
+  ProcMixerActivity<ProcNM<2>> stage(ActivityVote(-1));
   const uint16_t decision = 0x51;
   EXPECT_FALSE(stage.accept(&decision, 1));
   EXPECT_EQ(stage.length(), 0);
