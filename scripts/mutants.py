@@ -19,11 +19,13 @@ what killed the last mutant of the file at the front. Nothing is random: address
 
 import argparse
 import collections
+import contextlib
 import itertools
 import os
 import pathlib
 import re
 import resource
+import signal
 import subprocess
 import sys
 import threading
@@ -287,13 +289,17 @@ class Copy:
         command = ["setarch", "--addr-no-randomize", self.build / "bin" / program.name, *program.arguments]
         if only != "*":
             command.append("--gtest_filter=" + only)
+        settings = {"SENSELOOM_TEST_SEED": "1", "LOCPATH": str(self.build / "tests" / "locales")}
+        run = subprocess.Popen(command, cwd=self.runs, env={**os.environ, **settings}, stdout=subprocess.DEVNULL,
+                               stderr=subprocess.DEVNULL, start_new_session=True)
         try:
-            settings = {"SENSELOOM_TEST_SEED": "1", "LOCPATH": str(self.build / "tests" / "locales")}
-            return subprocess.run(command, cwd=self.runs, env={**os.environ, **settings},
-                                  timeout=timeout, stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL,
-                                  check=False).returncode == 0
+            return run.wait(timeout) == 0
         except subprocess.TimeoutExpired:
             return False
+        finally:
+            with contextlib.suppress(ProcessLookupError):
+                os.killpg(run.pid, signal.SIGKILL)  # with what the program started itself and has not ended
+            run.wait()
 
     def calibrate(self, program):
         """Finds how long a program takes, and whether it needs a process for each of its tests."""
