@@ -10,12 +10,12 @@ namespace {
 
 // An hour with one change after 30 minutes, and a slip of the classifier before it and after it. In batches of two: 1,
 // 6, 1, 2, 6, 2, and half of one. In batches of four: 1, 6, 2.
-const std::string kTrace = decisionsEach(
+const std::string kHour = decisionsEach(
     300, {{1, 1}, {1, 1}, {1, 1}, {2, 1}, {1, 1}, {1, 1}, {2, 2}, {2, 2}, {2, 2}, {1, 2}, {2, 2}, {2, 2}, {2, 2}});
 
 ToolRun sweepTrace(std::vector<std::string> more) {
   more.insert(more.begin(), {"--sensor", "PHYAC", "--option", R"({"mode":1})"});
-  return sweepOf(kTrace, more);
+  return sweepOf(kHour, more);
 }
 
 TEST(SweepOutput, IsATableWithARowACombination) {

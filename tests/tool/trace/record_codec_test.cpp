@@ -7,14 +7,11 @@
 #include <string>
 
 #include "input_error.h"
+#include "parsed.h"
 #include "trace/hex.h"
 
 namespace senseloom::tool {
 namespace {
-
-Json parsed(const std::string& text) {
-  return Json(json_loads(text.c_str(), 0, nullptr));
-}
 
 std::string encoded(const std::string& sensor, const std::string& record) {
   return toHex(encodeRecord(sensorNamed(sensor), parsed(record).get()));

@@ -6,13 +6,10 @@
 #include <utility>
 
 #include "input_error.h"
+#include "parsed.h"
 
 namespace senseloom::tool {
 namespace {
-
-Json parsed(const std::string& text) {
-  return Json(json_loads(text.c_str(), 0, nullptr));
-}
 
 TraceCall callOf(const std::string& line) {
   return readCall(parsed(line));

@@ -66,6 +66,10 @@ class Rebuild:
         moved = re.sub(r" -MD -MT \S+ -MF \S+", "", moved)
         moved = re.sub(r" -Winvalid-pch| -include \S+/cmake_pch\.hxx", "", moved)  # precompiled for other sources
         arguments = [str(made) if argument == name else argument for argument in shlex.split(moved)]
+        if "/Unity/" in arguments[-1]:  # several sources in one, each by its full path
+            together = made.with_suffix(".cxx")
+            together.write_text(pathlib.Path(arguments[-1]).read_text().replace(f"{self.root}/", f"{self.tree}/"))
+            arguments[-1] = str(together)
         plain = ["-O0"] + (["-U_FORTIFY_SOURCE"] if "_FORTIFY_SOURCE" in command else [])  # which takes optimisation
         self._run([*arguments, *plain])
         self.remade[name] = str(made)
