@@ -28,6 +28,7 @@ install(FILES LICENSE data/NOTICE TYPE DOC COMPONENT library) # the latter: what
 
 install(FILES include/senseloom.h include/senseloom.hpp TYPE INCLUDE COMPONENT development)
 install(FILES docs/man/libsenseloom.3 DESTINATION ${CMAKE_INSTALL_MANDIR}/man3 COMPONENT development)
+install(FILES docs/man/senseloom-options.7 DESTINATION ${CMAKE_INSTALL_MANDIR}/man7 COMPONENT development)
 # What CMake and pkg-config find the library by. Both tell where it is from where they are, so an installed tree can be
 # moved.
 set(package_dir ${CMAKE_INSTALL_LIBDIR}/cmake/senseloom)

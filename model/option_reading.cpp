@@ -61,7 +61,8 @@ class Reader {
 
   void remarkOnKeys(json_t* root) {
     if (!json_is_object(root)) remark(notAnObject);
-    std::vector<std::string_view> known(row.stringKeys.begin(), row.stringKeys.end());
+    std::vector<std::string_view> known;
+    for (const StringKey& key : row.stringKeys) known.emplace_back(key.name);
     for (const Key& key : row.keys) known.emplace_back(key.name);
     const char* name;
     json_t* value;
@@ -75,7 +76,7 @@ class Reader {
   bool storeTemplates(const json_t* root) {
     bool stored = true;
     for (size_t slot = 0; slot < row.stringKeys.size(); ++slot) {
-      const char* key = row.stringKeys.begin()[slot];
+      const char* key = row.stringKeys.begin()[slot].name;
       const json_t* value = json_object_get(root, key);
       if (!json_is_string(value)) {
         if (value != nullptr) remark(notAString, key);

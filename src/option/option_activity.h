@@ -27,8 +27,6 @@ inline constexpr OptionDescription kActivity{
     .keys = kActivityKeys,
     .properties = kActivityProperties,
     .logTag = kLogTag,
-    .note =
-        "property 43: 1 << the largest \"logN\" as given, in the high 16 bits; 1 << the smallest in the low 16 bits",
 };
 
 class OptionActivity final : public IntegerOption<OptionActivity, kActivity> {

@@ -11,8 +11,7 @@ inline constexpr OptionKey kStepCountKeys[] = {
      .defaultValue = 1,
      .range = {1, 100},
      .outOfRange = OutOfRange::clamped,
-     .merge = Merge::minimum,
-     .note = "a plain count, in hundreds of steps"},
+     .merge = Merge::minimum},
 };
 inline constexpr OptionProperty kStepCountProperties[] = {{141, "mode"}, {142, "logN"}};
 inline constexpr OptionDescription kStepCount{

@@ -188,8 +188,8 @@ class Generator {
     for (const model::Key& key : row.keys) {
       if (!choices.oneIn(3) || (sensor == dtwgs && !choices.oneIn(6))) members.emplace_back(key.name, value(key));
     }
-    for (const char* key : row.stringKeys) {
-      if (choices.oneIn(4)) members.emplace_back(key, choices.oneIn(8) ? oneOf(kNotIntegers) : templateText());
+    for (const model::StringKey& key : row.stringKeys) {
+      if (choices.oneIn(4)) members.emplace_back(key.name, choices.oneIn(8) ? oneOf(kNotIntegers) : templateText());
     }
     if (choices.oneIn(20)) members.emplace_back("colour", value({.name = "colour", .low = 0, .high = 9}));
     return call;

@@ -78,8 +78,10 @@ TEST_P(OptionContract, DescriptionTellsTheKeys) {
     EXPECT_EQ(static_cast<int>(described.outOfRange), static_cast<int>(key.outOfRange));
     EXPECT_EQ(static_cast<int>(described.merge), static_cast<int>(key.merge));
   }
-  EXPECT_EQ(std::vector<std::string>(description.stringKeys.begin(), description.stringKeys.end()),
-            std::vector<std::string>(row.stringKeys.begin(), row.stringKeys.end()));
+  ASSERT_EQ(description.stringKeys.size(), row.stringKeys.size());
+  for (size_t i = 0; i < row.stringKeys.size(); ++i) {
+    EXPECT_STREQ(description.stringKeys[i], row.stringKeys.begin()[i].name);
+  }
 }
 
 TEST_P(OptionContract, DescriptionTellsThePropertiesAndTheLog) {

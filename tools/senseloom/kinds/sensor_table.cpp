@@ -9,19 +9,43 @@
 namespace senseloom::tool {
 namespace {
 
+constexpr char kClassMeans[] = "a class number from 1; what it stands for is defined by whoever makes the records";
+constexpr char kUnreadClassMeans[] = "not looked at: what it stands for is defined by whoever makes the records";
+
 constexpr Sensor kSensors[] = {
-    {.name = "PHYAC", .items = Items::decisions, .lasts = true, .noMajorityClass = 6},
-    {.name = "STAP", .value = "classes", .shown = Shown::classSet},
-    {.name = "GSFLK", .value = "class"},
-    {.name = "SHAKI", .value = "class"},
-    {.name = "ISACT", .value = "class", .valueSize = 4, .lasts = true},
-    {.name = "SCOUN", .value = "steps", .valueSize = 4, .shown = Shown::amount},
-    {.name = "GSPX", .value = "prx", .items = Items::samples, .resultValue = "class"},
-    {.name = "DTWGS", .value = "classes", .bytesProperty = 123, .shown = Shown::classSet},
-    {.name = "GSETH", .value = "class"},
-    {.name = "LPE_P", .value = "class", .lasts = true},
-    {.name = "PDR", .items = Items::opaque, .shown = Shown::amount},
-    {.name = "LIFT", .value = "class"},
+    {.name = "PHYAC",
+     .items = Items::decisions,
+     .itemsMean = "\"class\": 6 stands for no majority in a vote, 0 also for a class not wanted, and the others are "
+                  "defined by whoever makes the records; \"seq\": the number of the decision",
+     .lasts = true,
+     .noMajorityClass = 6},
+    {.name = "STAP",
+     .value = "classes",
+     .valueMeans = "a set of bits; what a bit stands for is defined by whoever makes the records",
+     .shown = Shown::classSet},
+    {.name = "GSFLK", .value = "class", .valueMeans = kClassMeans},
+    {.name = "SHAKI", .value = "class", .valueMeans = kUnreadClassMeans},
+    {.name = "ISACT", .value = "class", .valueSize = 4, .valueMeans = kClassMeans, .lasts = true},
+    {.name = "SCOUN", .value = "steps", .valueSize = 4, .valueMeans = "the steps so far", .shown = Shown::amount},
+    {.name = "GSPX",
+     .value = "prx",
+     .items = Items::samples,
+     .resultValue = "class",
+     .valueMeans = "0: nothing is near the device; a gesture counts only then",
+     .itemsMean = "six integers each, in order of time; only the platform's gesture engine interprets them",
+     .resultValueMeans = "1 to 9 are these digits, 10 is the digit 0, 11 to 16 are the letters A to F"},
+    {.name = "DTWGS",
+     .value = "classes",
+     .valueMeans = "the templates that the movement matches: bit 0 the first, bit 1 the second",
+     .bytesProperty = 123,
+     .shown = Shown::classSet},
+    {.name = "GSETH", .value = "class", .valueMeans = kClassMeans},
+    {.name = "LPE_P", .value = "class", .valueMeans = kUnreadClassMeans, .lasts = true},
+    {.name = "PDR",
+     .items = Items::opaque,
+     .itemsMean = "28 bytes each, which are copied as they are; what they hold is defined by whoever makes the records",
+     .shown = Shown::amount},
+    {.name = "LIFT", .value = "class", .valueMeans = kUnreadClassMeans},
 };
 
 constexpr const Sensor* find(std::string_view name) {
@@ -33,7 +57,9 @@ constexpr const Sensor* find(std::string_view name) {
 
 // A record without a named integer counts its items, each of which a result shows.
 constexpr bool isComplete(const Sensor& sensor) {
-  if (sensor.value != nullptr) return sensor.valueSize == 2 || sensor.valueSize == 4;
+  if ((sensor.items == Items::none) != (sensor.itemsMean == nullptr)) return false;
+  if ((sensor.resultValue == nullptr) != (sensor.resultValueMeans == nullptr)) return false;
+  if (sensor.value != nullptr) return sensor.valueMeans != nullptr && (sensor.valueSize == 2 || sensor.valueSize == 4);
   return sensor.valueSize == 2 && sensor.items != Items::none && sensor.items != Items::samples;
 }
 static_assert(std::all_of(std::begin(kSensors), std::end(kSensors), isComplete), "a row of kSensors lacks a field");

@@ -35,6 +35,11 @@ struct Sensor {
   Items items = Items::none;
   const char* resultValue = nullptr;  // the integer of a result, if that is something else than the record's
 
+  // What they mean, for people.
+  const char* valueMeans = nullptr;
+  const char* itemsMean = nullptr;
+  const char* resultValueMeans = nullptr;
+
   // Its properties: the id of the one whose value is bytes; all others are 32-bit integers.
   int32_t bytesProperty = -1;
 
@@ -43,6 +48,10 @@ struct Sensor {
   bool lasts = false;            // a class holds until the next record
   int32_t noMajorityClass = -1;  // the class that the library makes itself, for want of a majority
 };
+
+// What the timestamp of every record means, for people.
+inline constexpr char kTimestampMeans[] =
+    "any number, such as a time in any unit: it is copied or compared, and never interpreted";
 
 // Whether its results have classes.
 constexpr bool hasClasses(const Sensor& sensor) {

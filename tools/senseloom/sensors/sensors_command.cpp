@@ -18,7 +18,7 @@ struct SensorsArguments {
 
 void declareSensors(CLI::App& app, Action& action) {
   CLI::App* command = app.add_subcommand(
-      "sensors", "Print the sensors with their option keys, defaults, ranges, merge rules and properties.");
+      "sensors", "Print the sensors: their option keys, properties and record fields, and what each of them means.");
   auto arguments = std::make_shared<SensorsArguments>();
   command->add_option("SENSOR", arguments->sensor, "this sensor alone");
   command->add_flag("--json", arguments->json, "print one JSON object per sensor");

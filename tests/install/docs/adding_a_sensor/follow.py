@@ -14,10 +14,15 @@ FOLDERS = ["fuzz", "include", "model", "platform", "src", "tests", "tools"]
 
 SENSOR = """\
 SPIN: spin
-  key        default  range  out of range  merged to   note
-  classMask  15       1..15  becomes 15    bitwise or
-  speed      0        0..9   becomes 0     minimum
-  properties: 221 classMask, 222 speed
+  key        default  range  out of range  merged to   means
+  classMask  15       1..15  becomes 15    bitwise or  the directions wanted, bit i for class i + 1
+  speed      0        0..9   becomes 0     minimum     the least speed of a spin, in turns a second
+  property       means
+  221 classMask  "classMask", merged
+  222 speed      "speed", merged
+  field      means
+  timestamp  any number, such as a time in any unit: it is copied or compared, and never interpreted
+  class      a class number from 1; what it stands for is defined by whoever makes the records
 """
 RECEIVED = """\
   line  call        session   sensor  return  outcome
