@@ -17,3 +17,18 @@ set_target_properties(android::log PROPERTIES IMPORTED_LOCATION ${ANDROID_LOG_LI
 # Its declarations alone, for what brings its own definitions.
 add_library(android::log_headers INTERFACE IMPORTED)
 target_include_directories(android::log_headers INTERFACE ${ANDROID_LOG_INCLUDE_DIR})
+
+# Recordings are compressed by either. Of zlib in 32 bits Debian's host of 64 bits has what programs need, without the
+# name that a linker looks for.
+if(NOT ANDROID)
+  foreach(library zlib zstd)
+    find_path(${library}_INCLUDE_DIR ${library}.h REQUIRED)
+  endforeach()
+  find_library(zlib_LIBRARY NAMES z libz.so.1 REQUIRED)
+  find_library(zstd_LIBRARY zstd REQUIRED)
+  foreach(library zlib zstd)
+    add_library(${library}::${library} UNKNOWN IMPORTED)
+    set_target_properties(${library}::${library} PROPERTIES IMPORTED_LOCATION ${${library}_LIBRARY}
+                                                            INTERFACE_INCLUDE_DIRECTORIES ${${library}_INCLUDE_DIR})
+  endforeach()
+endif()

@@ -19,7 +19,7 @@ set_target_properties(
              INSTALL_RPATH "$ORIGIN/senseloom")
 set_target_properties(senseloom_cli PROPERTIES INSTALL_RPATH "$ORIGIN/${libdir_of_tool}")
 # The folder of liblog is no standard one.
-set_target_properties(senseloom senseloom_cli senseloom_trace hardware aware_primary
+set_target_properties(senseloom senseloom_cli hardware aware_primary
                       PROPERTIES INSTALL_RPATH_USE_LINK_PATH ON)
 
 install(TARGETS senseloom LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT library NAMELINK_COMPONENT development)
@@ -49,7 +49,7 @@ install(
   COMPONENT development)
 
 install(TARGETS senseloom_cli RUNTIME COMPONENT tool)
-install(TARGETS senseloom_trace LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT tool) # beside the library
+install(TARGETS senseloom_recorder senseloom_audit LIBRARY DESTINATION ${platform_dir} COMPONENT tool)
 install(FILES docs/man/senseloom.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1 COMPONENT tool)
 install(
   FILES tools/senseloom/completion.bash

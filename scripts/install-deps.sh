@@ -7,15 +7,15 @@ set -euo pipefail
 
 # Per task: packages that are programs or headers, and libraries, which 32-bit x86 needs in its own version, too.
 declare -A programs=(
-  [build]="g++ cmake ninja-build libcli11-dev"
-  [test]="abigail-tools binutils clang clang-13 doxygen dpkg-dev file groff-base libc++-dev libc++abi-dev lld locales pkg-config python3 python3-numpy valgrind"
+  [build]="g++ cmake ninja-build libcli11-dev zlib1g-dev"
+  [test]="abigail-tools binutils clang clang-13 doxygen dpkg-dev file groff-base libc++-dev libc++abi-dev lld locales pkg-config python3 python3-jsonschema python3-numpy valgrind"
   [bench]="libboost-dev librange-v3-dev"
   [fuzz]="clang libclang-rt-14-dev" # brings the runtime libraries of both word sizes
   [coverage]="clang libclang-rt-14-dev llvm"
   [lint]="clang-format clang-tidy codespell cppcheck shellcheck"
 )
 declare -A libraries=(
-  [build]="libjansson-dev android-liblog-dev"
+  [build]="libjansson-dev android-liblog-dev libzstd-dev zlib1g"
   [test]="libc6-dbg libgtest-dev"
   [bench]="libbenchmark-dev libsigc++-2.0-dev"
   [fuzz]=""

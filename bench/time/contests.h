@@ -8,5 +8,6 @@ void fanOutContests();
 void deadReckoningContest();
 void activityContests();
 void optionContests();
+void recordingContest();
 
 }  // namespace bench

@@ -10,6 +10,7 @@ int main(int argc, char** argv) {
   bench::deadReckoningContest();
   bench::activityContests();
   bench::optionContests();
+  bench::recordingContest();
   benchmark::RunSpecifiedBenchmarks();
   benchmark::Shutdown();
 }

@@ -41,6 +41,8 @@ TEST(CommandLine, RefusesWhatItDoesNotUnderstandWithStatus2) {
       {"replay", "--log", "loud", "lift.jsonl"},
       {"record"},
       {"record", "--"},
+      {"status"},
+      {"status", "self"},
       {"generate"},
       {"generate", "commute"},
       {"generate", "commute", "--seed", "-1"},

@@ -1,84 +1,85 @@
-#include <dlfcn.h>
-
-#include <cstddef>
-#include <new>
-
+// The library's names, as the program uses them: those that are recorded, and those that are only passed on.
+#include "library.h"
+#include "quick_sessions.h"
 #include "recorder.h"
 #include "senseloom.h"
 
-// The library's functions, as the program calls them: each passes the call on to the next definition, which is the
-// library's, and has it recorded.
-namespace senseloom::trace {
-namespace {
+using senseloom::trace::gBell;
+using senseloom::trace::gQuickSessions;
+using senseloom::trace::library;
+using senseloom::trace::QuickSessions;
+using senseloom::trace::recorder;
 
-// Never destroyed: programs close sessions in destructors of their own, some of which run after those of this library.
-Recorder& recorder() {
-  alignas(Recorder) static std::byte storage[sizeof(Recorder)];
-  static Recorder* const instance = new (storage) Recorder;
-  return *instance;
-}
+// The library uses these two as well, in place of its own: this library is before it wherever names are looked for,
+// since it needs it. (Not on Android 5, where a library finds its own names first: there they stay as they are.)
+constinit aware_hw_device* device = nullptr;
+constinit bool gIsActivated = false;
+
+namespace {
 
 [[gnu::destructor]] void atExit() {
   recorder().atExit();
 }
 
-// Null if the library was loaded with local scope only. A program then gets here only by asking the loader for any
-// function of this name.
-template <class Function>
-Function* nextDefinition(const char* name) {
-  return reinterpret_cast<Function*>(dlsym(RTLD_NEXT, name));
-}
-
-// Whether there is the sensor that the last call tried to open.
-bool sensorExists(const char* name) {
-  static const auto next = nextDefinition<decltype(getSensor)>("getSensor");
-  return next != nullptr && next(name) != nullptr;
-}
-
 }  // namespace
-}  // namespace senseloom::trace
-
-using senseloom::trace::nextDefinition;
-using senseloom::trace::recorder;
 
 void* ctx_open_session(const char* sensor) noexcept {
-  static const auto next = nextDefinition<decltype(ctx_open_session)>("ctx_open_session");
-  if (next == nullptr) return nullptr;
-  void* handle = next(sensor);
-  recorder().opened(sensor, senseloom::trace::sensorExists(sensor), handle);
-  return handle;
+  return recorder().open(sensor);
 }
 
 int ctx_set_option(void* handle, int32_t reserved, const char* option, ctx_option_t** out) noexcept {
-  static const auto next = nextDefinition<decltype(ctx_set_option)>("ctx_set_option");
-  if (next == nullptr) return -1;
-  recorder().beforeSetOption(handle, option, out);
-  const int returned = next(handle, reserved, option, out);
-  recorder().negotiated(returned, out);
-  return returned;
+  return recorder().setOption(handle, reserved, option, out);
 }
 
+// With nothing to record, one branch more than the library.
 int ctx_dispatch_data(void* handle, void* data, int len, void** out, int* outlen) noexcept {
-  static const auto next = nextDefinition<decltype(ctx_dispatch_data)>("ctx_dispatch_data");
-  if (next == nullptr) return -1;
-  recorder().beforeDispatch(handle, data, len, out, outlen);
-  const int returned = next(handle, data, len, out, outlen);
-  recorder().dispatched(returned, out, outlen);
+  auto* counts = gQuickSessions.find(handle, !gBell.isRung());
+  if (counts == nullptr) return recorder().dispatch(handle, data, len, out, outlen);
+  const int returned = library().dispatchData(handle, data, len, out, outlen);
+  QuickSessions::count(*counts, returned == 1);
   return returned;
 }
 
 int ctx_close_session(void* handle, ctx_option_t** option) noexcept {
-  static const auto next = nextDefinition<decltype(ctx_close_session)>("ctx_close_session");
-  if (next == nullptr) return -1;
-  recorder().beforeClose(handle, option);
-  const int returned = next(handle, option);
-  recorder().closed(handle, returned, option);
-  return returned;
+  return recorder().close(handle, option);
+}
+
+int32_t ctx_option_release(ctx_option_t* list) noexcept {
+  return recorder().release(list);
 }
 
 void ctx_uninit() noexcept {
-  static const auto next = nextDefinition<decltype(ctx_uninit)>("ctx_uninit");
-  if (next == nullptr) return;
-  next();
-  recorder().uninitialised();
+  recorder().uninit();
+}
+
+void* getSensor(const char* name) noexcept {
+  return library().getSensor(name);
+}
+
+bool audio_hal_init() noexcept {
+  return library().audioInit();
+}
+
+bool audio_hal_activate() noexcept {
+  return library().audioActivate();
+}
+
+bool audio_hal_deactivate() noexcept {
+  return library().audioDeactivate();
+}
+
+void* _va_init(varray_t* va, int elemSize) noexcept {
+  return library().vaInit(va, elemSize);
+}
+
+void* va_new(varray_t* va) noexcept {
+  return library().vaNew(va);
+}
+
+void* _va_del(varray_t* va, int index, void* out) noexcept {
+  return library().vaDel(va, index, out);
+}
+
+void va_free(varray_t* va) noexcept {
+  library().vaFree(va);
 }

@@ -11,7 +11,8 @@ _senseloom() {
     [senseloom]="--help --version"
     [replay]="--help --json --quiet --all --check --log --plot --class-names"
     [explain]="--help --records --plot --class-names"
-    [record]="--help --output"
+    [record]="--help --output --force --max-size --follow-forks --attach"
+    [status]="--help"
     [generate]="--help"
     [generate commute]="--help --seed --records"
     [sweep]="--help --session --sensor --option --set --truth --time-unit --sort --reverse --best --limit --json --plot --at-most-false --at-most-delay"
@@ -19,7 +20,7 @@ _senseloom() {
     [sensors]="--help --json"
   )
   local -A words=(
-    [senseloom]="replay explain record sweep generate convert sensors"
+    [senseloom]="replay explain record status sweep generate convert sensors"
     [generate]="commute"
   )
   local current=${COMP_WORDS[COMP_CWORD]} command="" candidates longer word
@@ -32,7 +33,7 @@ _senseloom() {
   case ${COMP_WORDS[COMP_CWORD - 1]} in
     --log) candidates="debug info warn error none" ;;
     --output | -o | --plot | --truth) return ;; # a file
-    --seed | --class-names | --session | --option | --set | --sort | --limit | --columns | --at-most-*) return ;; # whatever one likes
+    --seed | --max-size | --attach | --class-names | --session | --option | --set | --sort | --limit | --columns | --at-most-*) return ;; # whatever one likes
     --time-unit) candidates="s ms us ns" ;;
     --from) candidates="csv" ;;
     --sensor) candidates=$(_senseloom_sensors) ;;

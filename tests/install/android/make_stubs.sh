@@ -9,12 +9,12 @@ cd "$4"
 
 # names LIBRARY: assembles each name in a section of its own, as the NDK's archives are compiled.
 names() {
-  awk -v library="$1" '$1 == library {
+  awk -v library="$1" '$1 == library && $2 != "*" {
     for (i = 2; i <= NF; ++i) printf ".section .text.%s,\"ax\",@progbits\n.globl %s\n%s: .long 0\n", $i, $i, $i
   }' "$imports"
 }
 
-for library in libc liblog libjansson; do
+for library in $(awk '!/^(#|$|libc\+\+_static|libhardware|libgesture|libsenseloom)/ {print $1}' "$imports" | sort -u); do
   names $library | "${clang[@]}" -shared -fuse-ld=lld -Wl,-soname,$library.so -x assembler - -o $library.so
 done
 # Code that nobody calls, as most of an archive is.

@@ -10,8 +10,12 @@ set(CMAKE_C_COMPILER_TARGET i686-linux-android21)
 set(CMAKE_CXX_COMPILER_TARGET i686-linux-android21)
 set(CMAKE_TRY_COMPILE_TARGET_TYPE STATIC_LIBRARY)
 set(CMAKE_SYSROOT ${CMAKE_CURRENT_LIST_DIR}/sysroot)
+if(SENSELOOM_RECORDER)
+  set(recorder_headers "-isystem ${CMAKE_CURRENT_LIST_DIR}/sysroot_recorder -isystem ${KERNEL_HEADERS}")
+endif()
 # The C++ library has a <locale.h> of its own, which refuses to be used without localization.
-set(CMAKE_CXX_FLAGS_INIT "-isystem ${CMAKE_CURRENT_LIST_DIR}/sysroot/first -isystem /usr/include/c++/v1")
+set(CMAKE_CXX_FLAGS_INIT
+    "${recorder_headers} -isystem ${CMAKE_CURRENT_LIST_DIR}/sysroot/first -isystem /usr/include/c++/v1")
 # What of the C++ library stands on more of the C library than the sources need.
 foreach(feature THREADS LOCALIZATION WIDE_CHARACTERS MONOTONIC_CLOCK)
   string(APPEND CMAKE_CXX_FLAGS_INIT " -D_LIBCPP_HAS_NO_${feature}")

@@ -101,9 +101,47 @@ TEST(ReplayCheck, ShowsEveryDifference) {
 }
 
 TEST(ReplayCheck, CountsCallsWithoutARecordedResult) {
-  const ToolRun run = runTool({"replay", "--check", "tapping.jsonl"});
-  EXPECT_EQ(run.out, "0 calls compared, all as recorded; 20 without a recorded result\n");
+  const ToolRun run = checkText(std::string(kRecording) + R"({"call":"uninit"})");
+  EXPECT_EQ(run.out, "6 calls compared, all as recorded; 1 without a recorded result\n");
   EXPECT_EQ(run.status, 0);
+}
+
+TEST(ReplayCheck, FailsWhenThereIsNothingToCompare) {
+  const ToolRun run = runTool({"replay", "--check", "tapping.jsonl"});
+  EXPECT_EQ(run.out, "");
+  EXPECT_EQ(run.err, "senseloom: nothing was compared: none of 20 calls has a recorded result to compare with\n");
+  EXPECT_EQ(run.status, 1);
+}
+
+// The batch of two was half full when the recording began. A session that starts over is in the middle of nothing.
+TEST(ReplayCheck, ComparesAResumedSessionOnceItIsKnownHowFarItIs) {
+  const std::string start = R"({"call":"open","session":"a","sensor":"PHYAC","resumed":1}
+{"call":"set_option","session":"a","option":{"logN":1}}
+{"call":"dispatch","session":"a","record":{"hex":"000000000000000001000000"},"returned":1,"result":{"hex":"000000000000000001000000"}}
+{"call":"dispatch","session":"a","record":{"hex":"010000000000000001000000"},"returned":0}
+)";
+  const std::string restart = R"({"call":"set_option","session":"a","option":{"logN":0}}
+{"call":"open","session":"b","sensor":"PHYAC","returned":"handle"}
+{"call":"close","session":"b","returned":1,"properties":[{"id":41,"size":4,"value":"00000000"},{"id":43,"size":4,"value":"01000100"},{"id":44,"size":4,"value":"01000000"},{"id":42,"size":4,"value":"ffffffff"}]}
+{"call":"dispatch","session":"a","record":{"hex":"020000000000000001000000"},"returned":0}
+)";
+  const ToolRun run = checkText(start + restart);
+  EXPECT_NE(run.out.find("standard input:8: dispatch of session \"a\" differs"), std::string::npos) << run.out;
+  EXPECT_EQ(run.err, "senseloom: 1 of 3 calls compared differ\n");
+  EXPECT_EQ(checkText(start).err,
+            "senseloom: nothing was compared: none of 4 calls has a recorded result to compare with\n");
+}
+
+TEST(ReplayCheck, SaysThatATraceIsEmpty) {
+  const ToolRun run = checkText("\n");
+  EXPECT_EQ(run.err,
+            "senseloom: standard input: the trace is empty: there is no call in it\n"
+            "senseloom: nothing was compared: none of 0 calls has a recorded result to compare with\n");
+  EXPECT_EQ(run.status, 1);
+  for (const std::vector<std::string>& command :
+       {std::vector<std::string>{"replay", "-"}, {"replay", "--json", "-"}, {"explain", "-"}}) {
+    EXPECT_EQ(runTool(command).err, "senseloom: standard input: the trace is empty: there is no call in it\n");
+  }
 }
 
 TEST(ReplayCheck, StopsAtALineThatIsNotACall) {

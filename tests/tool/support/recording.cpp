@@ -3,7 +3,10 @@
 #include <gtest/gtest.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cstdio>
+#include <filesystem>
+#include <regex>
 
 namespace senseloom::tool {
 namespace {
@@ -19,6 +22,23 @@ ScratchFile::ScratchFile(const std::string& purpose)
 
 ScratchFile::~ScratchFile() {
   std::remove(name.c_str());
+}
+
+ScratchFolder::ScratchFolder(const std::string& purpose)
+    : name(testing::TempDir() + purpose + '_' + std::to_string(getpid())) {
+  std::filesystem::remove_all(name);
+  std::filesystem::create_directory(name);
+}
+
+ScratchFolder::~ScratchFolder() {
+  std::filesystem::remove_all(name);
+}
+
+std::vector<std::string> ScratchFolder::files() const {
+  std::vector<std::string> names;
+  for (const auto& entry : std::filesystem::directory_iterator(name)) names.push_back(entry.path().filename());
+  std::sort(names.begin(), names.end());
+  return names;
 }
 
 Environment recordingEnvironment() {
@@ -38,8 +58,24 @@ ToolRun recordTo(const std::string& file, std::vector<std::string> command, cons
   return runTool(command, input, all);
 }
 
+ToolRun recordDriven(const std::string& file, const std::string& lines, std::vector<std::string> options) {
+  options.insert(options.begin(), {"record", "-o", file});
+  options.insert(options.end(), {"--", DRIVEN_FILE});
+  return runTool(options, lines, recordingEnvironment());
+}
+
 ToolRun check(const std::string& file) {
   return runTool({"replay", "--check", file}, "", kGestures);
+}
+
+std::string callsOf(const std::string& recording) {
+  static const std::regex kAbout(R"re((\{"(format|end)":[^\n]*\n)|(\{"note":[^\n]*,"breach":[^\n]*\n))re");
+  static const std::regex kTime(R"re(,"atUs":\d+,"thread":\d+,"tookNs":\d+)re");
+  return std::regex_replace(std::regex_replace(recording, kAbout, ""), kTime, "");
+}
+
+std::string summaryOf(size_t calls, const std::string& file) {
+  return "senseloom: " + std::to_string(calls) + (calls == 1 ? " call" : " calls") + " recorded in " + file + '\n';
 }
 
 }  // namespace senseloom::tool

@@ -39,6 +39,7 @@ TEST(SweepErrors, NameAnArgument) {
 
 TEST(SweepErrors, SayWhichClientIsMissing) {
   EXPECT_EQ(errorOf("", {"--sensor", "STAP", "--set", "level=0"}),
+            "senseloom: standard input: the trace is empty: there is no call in it\n"
             "senseloom: standard input: no record reaches sensor STAP\n");
   EXPECT_EQ(errorOf(kTrace, {"--session", "fit", "--set", "logN=0"}),
             "senseloom: standard input: no session \"fit\" is opened\n");

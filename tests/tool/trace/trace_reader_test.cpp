@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdio>
 #include <fstream>
 #include <string>
@@ -19,7 +20,15 @@ class TraceReading : public testing::Test {
 
   TraceReader readerOf(const std::string& text) {
     std::ofstream(file, std::ios::binary) << text;
-    return TraceReader(file);
+    return TraceReader(file, [this](const std::string& remark) { remarks += remark + '\n'; });
+  }
+
+  // What is remarked upon of a trace, without its name.
+  std::string remarksOn(const std::string& text) {
+    TraceReader reader = readerOf(text);
+    while (reader.next()) {
+    }
+    return remarks.substr(std::min(file.size(), remarks.size()));
   }
 
   std::string errorOf(const std::string& line) {
@@ -32,6 +41,7 @@ class TraceReading : public testing::Test {
     }
   }
 
+  std::string remarks;
   // One a test, since tests run at the same time.
   const std::string file =
       testing::TempDir() + "trace_" + testing::UnitTest::GetInstance()->current_test_info()->name();
@@ -75,8 +85,50 @@ TEST_F(TraceReading, TakesALastLineWithoutItsEnd) {
   EXPECT_FALSE(reader.next());
 }
 
-TEST_F(TraceReading, FindsNothingInAnEmptyFile) {
-  EXPECT_FALSE(readerOf("").next());
+TEST_F(TraceReading, FindsNothingInAnEmptyFileAndSaysSo) {
+  EXPECT_EQ(remarksOn(""), ": the trace is empty: there is no call in it\n");
+}
+
+const std::string kHead = R"({"format":1,"tool":"1.0.0"})"
+                          "\n";
+const std::string kCall = R"({"call":"uninit","atUs":3})"
+                          "\n";
+
+TEST_F(TraceReading, PassesARecordingThatIsWhole) {
+  EXPECT_EQ(remarksOn(kHead + kCall + kCall + R"({"end":2,"lost":0})" + "\n"), "");
+  EXPECT_EQ(remarksOn(kHead + kCall + R"({"end":1,"lost":0})" + "\n" + kCall + R"({"end":2,"lost":0})"), "");
+}
+
+TEST_F(TraceReading, RemarksOnARecordingWithoutItsEnd) {
+  const std::string cut = ": the recording was cut short after 1 calls: its end is missing\n";
+  EXPECT_EQ(remarksOn(kHead + kCall), cut);
+  remarks.clear();
+  EXPECT_EQ(remarksOn(kHead + kCall + kCall.substr(0, 20)), cut) << "in the middle of a line";
+  remarks.clear();
+  EXPECT_EQ(remarksOn(kHead + kCall + std::string(9000, '\0')), cut) << "before room that was not used";
+  remarks.clear();
+  EXPECT_EQ(remarksOn(kHead + kCall + R"({"end":1,"lost":0})" + "\n" + kCall),
+            ": the recording was cut short after 2 calls: its end is missing\n");
+}
+
+TEST_F(TraceReading, RemarksOnWhatIsMissing) {
+  EXPECT_EQ(remarksOn(kHead + kCall + R"({"end":2,"lost":3,"why":"no room","cause":"a signal"})"),
+            ":3: the recording ended with 2 calls, but 1 are there\n" + file +
+                ":3: 3 lines could not be recorded: no room\n" + file + ":3: a signal\n");
+}
+
+TEST_F(TraceReading, RemarksOnBreachesOfTheContract) {
+  EXPECT_EQ(remarksOn(R"({"note":"two at once","breach":"two threads","threads":[1,2]})"
+                      "\n" +
+                      std::string(R"({"call":"uninit"})")),
+            ":1: two at once\n");
+}
+
+TEST_F(TraceReading, RefusesAnotherFormatAnotherHeadAndNoHead) {
+  EXPECT_EQ(errorOf(R"({"format":2})"), "a trace of format 2, where this program reads format 1");
+  EXPECT_EQ(errorOf(kHead + kHead),
+            "another recording, or another part of it, begins here: each is a trace of its own");
+  EXPECT_EQ(errorOf(kCall), "this is in the middle of a recording, whose head is missing");
 }
 
 TEST_F(TraceReading, SkipsNotesOnLinesOfTheirOwn) {

@@ -42,7 +42,10 @@ void declareExplain(CLI::App& app, Action& action) {
   auto* options = command->add_option("OPTION", arguments->options, "the option string of a session on the sensor");
   command->add_flag("--records", arguments->records, "explain what became of each record, too")->excludes(options);
   addPlotOptions(*command, arguments->plot)->excludes(options);
-  command->callback([arguments, &action] { action = [arguments](std::FILE* out) { explain(out, *arguments); }; });
+  command->callback([arguments, options, &action] {
+    arguments->options = options->reduced_results();
+    action = [arguments](std::FILE* out) { explain(out, *arguments); };
+  });
 }
 
 }  // namespace senseloom::tool

@@ -9,6 +9,7 @@
 #include "input_error.h"
 #include "plot/replay_plot.h"
 #include "replay/replay_progress.h"
+#include "terminal/interrupt.h"
 #include "trace/json.h"
 #include "trace/replayer.h"
 #include "trace/trace_reader.h"
@@ -54,6 +55,7 @@ void explainOptions(std::FILE* out, const std::string& sensor, const std::vector
 }
 
 void explainTrace(std::FILE* out, const std::string& file, bool withRecords, const PlotArguments& plot) {
+  const InterruptMark mark;
   TraceReader trace = openTrace(file);
   LogCapture log;
   auto explainer = std::make_unique<Explainer>(out, log, withRecords);

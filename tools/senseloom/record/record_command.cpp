@@ -5,30 +5,52 @@
 #include <string>
 #include <vector>
 
+#include "record/attached_process.h"
 #include "record/recorded_program.h"
 
 namespace senseloom::tool {
 namespace {
 
 struct RecordArguments {
-  std::string file = "trace.jsonl";
+  RecordingArguments recording;
+  pid_t process = 0;
   std::vector<std::string> command;
 };
+
+void record(std::FILE* out, const RecordArguments& arguments) {
+  if (arguments.process != 0) {
+    recordAttached(out, arguments.recording, arguments.process);
+  } else {
+    runRecorded(out, arguments.recording, arguments.command);
+  }
+}
 
 }  // namespace
 
 void declareRecord(CLI::App& app, Action& action) {
-  CLI::App* command =
-      app.add_subcommand("record", "Start a program with its calls of the library recorded in a trace.");
+  CLI::App* command = app.add_subcommand("record", "Run a program with its calls of the library recorded in a trace.");
   command->footer(
       "What follows -- belongs to the program: senseloom record -o FILE -- PROGRAM ARGUMENT...\n"
-      "Exit status: that of the program; 2 when it cannot be started.");
+      "A FILE that ends in .gz or .zst is compressed; - is standard output, and the program's goes to standard error.\n"
+      "Exit status: that of the program; 2 when it cannot be started or recorded; 3 when nothing was recorded.");
   auto arguments = std::make_shared<RecordArguments>();
-  command->add_option("-o,--output", arguments->file, "the trace; an existing file is overwritten")
+  RecordingArguments& recording = arguments->recording;
+  command->add_option("-o,--output", recording.file, "the trace; %p becomes the id of the process")
       ->capture_default_str();
-  command->add_option("COMMAND", arguments->command, "the program and its arguments")->required();
-  command->callback([arguments, &action] {
-    action = [arguments](std::FILE* out) { startRecorded(out, arguments->file, arguments->command); };
+  command->add_flag("--force", recording.force, "replace a file that holds something");
+  command->add_option("--max-size", recording.maxSize, "begin another file after so many bytes; 10k, 10M, 10G")
+      ->transform(CLI::AsSizeValue(false))
+      ->type_name("SIZE");
+  auto* follow = command->add_flag("--follow-forks", recording.followForks, "record forked children, too");
+  auto* attach = command->add_option("--attach", arguments->process, "record a process that runs, until interrupted")
+                     ->check(CLI::PositiveNumber)
+                     ->type_name("PID");
+  auto* program = command->add_option("COMMAND", arguments->command, "the program and its arguments");
+  attach->excludes(program)->excludes(follow);
+  command->callback([arguments, attach, program, &action] {
+    if (attach->empty() && program->empty()) throw CLI::RequiredError("COMMAND");
+    arguments->command = program->reduced_results();
+    action = [arguments](std::FILE* out) { record(out, *arguments); };
   });
 }
 

@@ -16,6 +16,7 @@
 #include "replay/replay_progress.h"
 #include "replay/summary_output.h"
 #include "replay/table_output.h"
+#include "terminal/interrupt.h"
 #include "trace/replayer.h"
 #include "trace/trace_reader.h"
 
@@ -64,6 +65,7 @@ std::unique_ptr<ReplayObserver> makeOutput(std::FILE* out, const ReplayArguments
 }
 
 void replay(std::FILE* out, const ReplayArguments& arguments) {
+  const InterruptMark mark;
   TraceReader trace(arguments.file);
   __android_log_set_minimum_priority(kLogLevels.at(arguments.log));
   const bool isFilling = !arguments.quiet && !arguments.check;

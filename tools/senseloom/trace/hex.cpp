@@ -5,14 +5,20 @@
 
 namespace senseloom::tool {
 
-std::string toHex(std::span<const uint8_t> bytes) {
+void appendHex(std::string& text, std::span<const uint8_t> bytes) {
   static constexpr char kDigits[] = "0123456789abcdef";
-  std::string digits;
-  digits.reserve(2 * bytes.size());
+  const size_t start = text.size();
+  text.resize(start + 2 * bytes.size());
+  char* digit = text.data() + start;
   for (const uint8_t byte : bytes) {
-    digits += kDigits[byte >> 4];
-    digits += kDigits[byte & 15];
+    *digit++ = kDigits[byte >> 4];
+    *digit++ = kDigits[byte & 15];
   }
+}
+
+std::string toHex(std::span<const uint8_t> bytes) {
+  std::string digits;
+  appendHex(digits, bytes);
   return digits;
 }
 

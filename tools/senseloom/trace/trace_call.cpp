@@ -101,6 +101,7 @@ TraceCall readCall(const Json& object) {
     case CallKind::open:
       call.session = sessionMember(object);
       call.sensor = sensorMember(object);
+      call.isResumed = json_object_get(object.get(), member::kResumed) != nullptr;
       break;
     case CallKind::setOption:
       call.session = sessionMember(object);

@@ -18,6 +18,7 @@ struct TraceCall {
   const Sensor* sensor = nullptr;     // of an open, and of a dispatch to a whole sensor
   std::optional<std::string> option;  // of a set_option; nothing: a null pointer
   Json record;                        // of a dispatch
+  bool isResumed = false;             // an open: the session was open before the recording
   Json recorded;                      // what a recording says of its outcome; null: nothing
   Json truth;                         // of a dispatch: the member of that name, whatever it is; null: there is none
 };

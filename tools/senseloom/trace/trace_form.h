@@ -40,6 +40,34 @@ inline constexpr char kSize[] = "size";
 inline constexpr char kValue[] = "value";
 inline constexpr char kResult[] = "result";
 
+// When a call was made, as a recording tells it.
+inline constexpr char kAt[] = "atUs";  // microseconds since the recording began
+inline constexpr char kThread[] = "thread";
+inline constexpr char kTook[] = "tookNs";  // nanoseconds in the library
+
+// The head of a recording, a line of its own.
+inline constexpr char kFormat[] = "format";
+inline constexpr char kTool[] = "tool";
+inline constexpr char kLibrary[] = "library";
+inline constexpr char kProgram[] = "program";
+inline constexpr char kProcess[] = "process";
+inline constexpr char kBits[] = "bits";
+inline constexpr char kStarted[] = "started";
+inline constexpr char kClock[] = "clock";
+inline constexpr char kPart[] = "part";
+inline constexpr char kRefused[] = "refused";  // of an option that was refused before
+inline constexpr char kResumed[] = "resumed";  // of an open that was made before the recording
+
+// Its end, and what is missing.
+inline constexpr char kEnd[] = "end";
+inline constexpr char kLost[] = "lost";
+inline constexpr char kWhy[] = "why";
+inline constexpr char kCause[] = "cause";  // the recording did not end by itself
+
+// A note about a breach of the library's contract.
+inline constexpr char kBreach[] = "breach";
+inline constexpr char kThreads[] = "threads";
+
 // A record, a result: its bytes, or its fields beside those that a sensor names itself.
 inline constexpr char kHex[] = "hex";
 inline constexpr char kTimestamp[] = "timestamp";
@@ -49,6 +77,9 @@ inline constexpr char kSequence[] = "seq";
 inline constexpr char kSamples[] = "samples";
 
 }  // namespace member
+
+// The format of recordings that is written and read.
+inline constexpr int kTraceFormat = 1;
 
 // What an open returned that gave a session, in "returned".
 inline constexpr char kHandle[] = "handle";

@@ -1,6 +1,7 @@
 #include "trace/trace_line.h"
 
 #include <algorithm>
+#include <charconv>
 #include <cstdio>
 
 #include "trace/hex.h"
@@ -34,7 +35,7 @@ std::string escaped(std::string_view text) {
 void TraceLine::addText(std::string_view key, std::string_view text) {
   if (std::any_of(text.begin(), text.end(), isBeyondAscii)) {
     addKey(std::string(key) + "Hex");
-    addQuoted(toHex({reinterpret_cast<const uint8_t*>(text.data()), text.size()}));
+    addHex({reinterpret_cast<const uint8_t*>(text.data()), text.size()});
   } else {
     addKey(key);
     addQuoted(escaped(text));
@@ -43,7 +44,7 @@ void TraceLine::addText(std::string_view key, std::string_view text) {
 
 void TraceLine::addInteger(std::string_view key, int64_t value) {
   addKey(key);
-  buffer += std::to_string(value);
+  addNumber(value);
 }
 
 void TraceLine::addNull(std::string_view key) {
@@ -54,7 +55,7 @@ void TraceLine::addNull(std::string_view key) {
 void TraceLine::addBytes(std::string_view key, std::span<const uint8_t> bytes) {
   beginObject(key);
   addKey(member::kHex);
-  addQuoted(toHex(bytes));
+  addHex(bytes);
   endObject();
 }
 
@@ -90,8 +91,17 @@ void TraceLine::addProperty(int32_t id, std::span<const uint8_t> value) {
   addInteger(member::kId, id);
   addInteger(member::kSize, static_cast<int64_t>(value.size()));
   addKey(member::kValue);
-  addQuoted(toHex(value));
+  addHex(value);
   endObject();
+}
+
+void TraceLine::addThreads(std::span<const int> threads) {
+  beginArray(member::kThreads);
+  for (const int thread : threads) {
+    separate();
+    addNumber(thread);
+  }
+  endArray();
 }
 
 std::string_view TraceLine::finish() {
@@ -114,6 +124,17 @@ void TraceLine::addQuoted(std::string_view text) {
   buffer += '"';
   buffer += text;
   buffer += '"';
+}
+
+void TraceLine::addHex(std::span<const uint8_t> bytes) {
+  buffer += '"';
+  appendHex(buffer, bytes);
+  buffer += '"';
+}
+
+void TraceLine::addNumber(int64_t value) {
+  char digits[20];
+  buffer.append(digits, std::to_chars(digits, digits + sizeof digits, value).ptr);
 }
 
 }  // namespace senseloom::tool

@@ -14,6 +14,8 @@ class TraceLine {
  public:
   void clear() { buffer.clear(); }
   bool isEmpty() const { return buffer.empty(); }
+  // What there is so far.
+  std::string_view text() const { return buffer; }
 
   // A text becomes a string. JSON cannot hold what is not UTF-8, so a text beyond ASCII becomes its bytes, in a member
   // with "Hex" at the end of its name.
@@ -36,6 +38,9 @@ class TraceLine {
   // An element of "properties": {"id","size","value"} with the value as hexadecimal digits.
   void addProperty(int32_t id, std::span<const uint8_t> value);
 
+  // "threads": numbers of threads.
+  void addThreads(std::span<const int> threads);
+
   // The whole line, with its line feed. Nothing is added to it after that.
   std::string_view finish();
 
@@ -43,6 +48,8 @@ class TraceLine {
   void separate();
   void addKey(std::string_view key);
   void addQuoted(std::string_view text);
+  void addHex(std::span<const uint8_t> bytes);
+  void addNumber(int64_t value);
 
   std::string buffer;
 };

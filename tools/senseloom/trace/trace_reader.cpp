@@ -1,39 +1,55 @@
 #include "trace/trace_reader.h"
 
-#include <sys/stat.h>
-
-#include <cerrno>
-#include <cstdlib>
-#include <cstring>
-#include <string_view>
+#include <algorithm>
+#include <cstdio>
+#include <utility>
 
 #include "input_error.h"
+#include "terminal/interrupt.h"
 #include "trace/time_unit.h"
 
 namespace senseloom::tool {
+namespace {
 
-void TraceReader::Close::operator()(std::FILE* file) const {
-  if (file != stdin) std::fclose(file);
+constexpr size_t kChunk = 1 << 16;
+
+std::unique_ptr<ByteStream> open(const std::string& file, const std::string& name) try {
+  return openBytes(file);
+} catch (const InputError& error) {
+  throw InputError(name + ": " + error.what());
 }
 
-void TraceReader::Free::operator()(char* text) const {
-  std::free(text);
+int64_t integerMember(const Json& object, const char* key) {
+  return json_integer_value(json_object_get(object.get(), key));
 }
 
-TraceReader::TraceReader(const std::string& file)
-    : name(file == "-" ? "standard input" : file), stream(file == "-" ? stdin : std::fopen(file.c_str(), "r")) {
-  if (stream == nullptr) throw InputError(name + ": " + std::strerror(errno));
+bool hasMember(const Json& object, const char* key) {
+  return json_object_get(object.get(), key) != nullptr;
 }
+
+std::string textMember(const Json& object, const char* key) {
+  const char* text = json_string_value(json_object_get(object.get(), key));
+  return text == nullptr ? "" : text;
+}
+
+}  // namespace
+
+TraceReader::TraceReader(const std::string& file, Remark toRemark)
+    : name(file == "-" ? "standard input" : file), remark(std::move(toRemark)), stream(open(file, name)) {}
 
 std::optional<TraceCall> TraceReader::next() {
   Json object;
   while (true) {
     object = nextObject();
-    if (object == nullptr) return std::nullopt;
-    if (!isNote(object)) break;
-    readNote(object);
+    if (object == nullptr) return end();
+    if (!readAboutRecording(object)) break;
   }
 
+  if (!isRecording && hasMember(object, member::kAt)) {
+    throw InputError("this is in the middle of a recording, whose head is missing");
+  }
+  ++calls;
+  hasEnd = false;
   TraceCall call = readCall(object);
   call.line = lineNumber;
   return call;
@@ -43,45 +59,112 @@ std::string TraceReader::position() const {
   return lineNumber == 0 ? name : name + ':' + std::to_string(lineNumber);
 }
 
-uint64_t TraceReader::size() const {
-  struct stat file {};
-  if (fstat(fileno(stream.get()), &file) != 0 || !S_ISREG(file.st_mode)) return 0;
-  return static_cast<uint64_t>(file.st_size);
+void TraceReader::printOnStandardError(const std::string& text) {
+  std::fprintf(stderr, "senseloom: %s\n", text.c_str());
+}
+
+// The object on the next line that is not blank; null at the end.
+Json TraceReader::nextObject() {
+  std::string_view line;
+  do {
+    if (isInterrupted() || !readLine()) return nullptr;
+    line = std::string_view(buffer).substr(lineStart, lineLength);
+    // Room that a recording has reserved, and did not come to use.
+    if (isRecording && line.front() == '\0') return nullptr;
+  } while (line.find_first_not_of(" \t\r\n") == std::string_view::npos);
+
+  json_error_t error;
+  Json object(json_loadb(line.data(), line.size(), JSON_REJECT_DUPLICATES, &error));
+  if (object == nullptr) {
+    if (isRecording && !isLineWhole) return nullptr;
+    throw InputError(std::string("not JSON: ") + error.text);
+  }
+  if (!json_is_object(object.get())) throw InputError("not a JSON object");
+  return object;
+}
+
+bool TraceReader::readLine() {
+  lineStart += std::exchange(lineLength, 0);
+  size_t searched = lineStart;
+  size_t feed;
+  while ((feed = buffer.find('\n', searched)) == std::string::npos) {
+    buffer.erase(0, std::exchange(lineStart, 0));
+    searched = buffer.size();
+    buffer.resize(searched + kChunk);
+    size_t count = 0;
+    try {
+      count = stream->read(buffer.data() + searched, kChunk);
+    } catch (...) {
+      buffer.resize(searched);
+      throw;
+    }
+    buffer.resize(searched + count);
+    if (count == 0) break;
+  }
+  isLineWhole = feed != std::string::npos;
+  lineLength = (isLineWhole ? feed + 1 : buffer.size()) - lineStart;
+  if (lineLength == 0) return false;
+  ++lineNumber;
+  byteCount += lineLength;
+  return true;
+}
+
+// Takes what is no call: a note, or what a recording says of itself.
+bool TraceReader::readAboutRecording(const Json& object) {
+  if (hasMember(object, member::kCall)) return false;
+  if (hasMember(object, member::kFormat)) {
+    readHead(object);
+  } else if (hasMember(object, member::kEnd)) {
+    readEnd(object);
+  } else if (isNote(object)) {
+    readNote(object);
+  } else {
+    return false;
+  }
+  return true;
 }
 
 void TraceReader::readNote(const Json& note) {
+  if (hasMember(note, member::kBreach)) remark(position() + ": " + textMember(note, member::kNote));
   const json_t* said = json_object_get(note.get(), member::kTimeUnit);
   if (said == nullptr) return;
   if (!json_is_string(said)) throw InputError("\"timeUnit\" must be a string");
   unit = timeUnitNamed(json_string_value(said));
 }
 
-// The object on the next line that is not blank; null at the end.
-Json TraceReader::nextObject() {
-  do {
-    if (!readLine()) return nullptr;
-  } while (std::string_view(buffer.get(), lineLength).find_first_not_of(" \t\r\n") == std::string_view::npos);
-
-  json_error_t error;
-  Json object(json_loadb(buffer.get(), lineLength, JSON_REJECT_DUPLICATES, &error));
-  if (object == nullptr) throw InputError(std::string("not JSON: ") + error.text);
-  if (!json_is_object(object.get())) throw InputError("not a JSON object");
-  return object;
+void TraceReader::readHead(const Json& object) {
+  const int64_t format = integerMember(object, member::kFormat);
+  if (format != kTraceFormat) {
+    throw InputError("a trace of format " + std::to_string(format) + ", where this program reads format " +
+                     std::to_string(kTraceFormat));
+  }
+  if (isRecording)
+    throw InputError("another recording, or another part of it, begins here: each is a trace of its own");
+  isRecording = true;
 }
 
-bool TraceReader::readLine() {
-  char* line = buffer.release();
-  errno = 0;
-  const ssize_t length = getline(&line, &bufferSize, stream.get());
-  buffer.reset(line);
-  if (length < 0) {
-    if (std::ferror(stream.get()) != 0) throw InputError(std::string("cannot be read: ") + std::strerror(errno));
-    return false;
+void TraceReader::readEnd(const Json& object) {
+  hasEnd = true;
+  const auto told = static_cast<uint64_t>(integerMember(object, member::kEnd));
+  if (told != calls) {
+    remark(position() + ": the recording ended with " + std::to_string(told) + " calls, but " + std::to_string(calls) +
+           " are there");
   }
-  lineLength = static_cast<size_t>(length);
-  ++lineNumber;
-  byteCount += lineLength;
-  return true;
+  const int64_t lost = integerMember(object, member::kLost);
+  if (lost != 0) {
+    remark(position() + ": " + std::to_string(lost) +
+           " lines could not be recorded: " + textMember(object, member::kWhy));
+  }
+  if (hasMember(object, member::kCause)) remark(position() + ": " + textMember(object, member::kCause));
+}
+
+std::nullopt_t TraceReader::end() {
+  if (std::exchange(wasEndReached, true) || isInterrupted()) return std::nullopt;
+  if (calls == 0) remark(name + ": the trace is empty: there is no call in it");
+  if (isRecording && !hasEnd) {
+    remark(name + ": the recording was cut short after " + std::to_string(calls) + " calls: its end is missing");
+  }
+  return std::nullopt;
 }
 
 }  // namespace senseloom::tool

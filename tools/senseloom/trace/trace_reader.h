@@ -2,22 +2,28 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <cstdio>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <string>
+#include <string_view>
 
+#include "trace/byte_stream.h"
 #include "trace/json.h"
 #include "trace/trace_call.h"
 
 namespace senseloom::tool {
 
 // Reads a trace, JSON Lines with one call a line, a line at a time. Blank lines are skipped, and so are lines with a
-// "note" in place of a call.
+// "note" in place of a call. What a recording says of itself is not a call either: what a reader of it should know, as
+// that something is missing or that the program broke the library's contract, is passed on as remarks. A trace without
+// a call is remarked upon, too.
 class TraceReader {
  public:
+  using Remark = std::function<void(const std::string& text)>;
+
   // "-" is standard input. Throws InputError when the file cannot be opened.
-  explicit TraceReader(const std::string& file);
+  explicit TraceReader(const std::string& file, Remark remark = printOnStandardError);
 
   // The next call, or nothing at the end. Throws InputError when there is none on a line that is not blank.
   std::optional<TraceCall> next();
@@ -32,29 +38,34 @@ class TraceReader {
   const std::string& fileName() const { return name; }
 
   uint64_t bytesRead() const { return byteCount; }
-  // Bytes of the whole trace; 0 when it is not a file.
-  uint64_t size() const;
+  // Bytes of the whole trace; 0 when that is not known.
+  uint64_t size() const { return stream->size(); }
 
  private:
-  struct Close {
-    void operator()(std::FILE* file) const;
-  };
-  struct Free {
-    void operator()(char* text) const;
-  };
+  static void printOnStandardError(const std::string& text);
 
   Json nextObject();
-  void readNote(const Json& note);
   bool readLine();
+  bool readAboutRecording(const Json& object);
+  void readNote(const Json& note);
+  void readHead(const Json& object);
+  void readEnd(const Json& object);
+  std::nullopt_t end();
 
   std::string name;
-  std::unique_ptr<std::FILE, Close> stream;
-  std::unique_ptr<char, Free> buffer;
-  size_t bufferSize = 0;
-  size_t lineLength = 0;
+  Remark remark;
+  std::unique_ptr<ByteStream> stream;
+  std::string buffer;     // what was read
+  size_t lineStart = 0;   // in it
+  size_t lineLength = 0;  // bytes, with the line feed
+  bool isLineWhole = true;
   size_t lineNumber = 0;
   uint64_t byteCount = 0;
   std::optional<int64_t> unit;
+  uint64_t calls = 0;
+  bool isRecording = false;  // it has a head
+  bool hasEnd = false;
+  bool wasEndReached = false;
 };
 
 }  // namespace senseloom::tool

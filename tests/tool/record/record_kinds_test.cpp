@@ -1,0 +1,113 @@
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <cstdlib>
+#include <filesystem>
+#include <string>
+
+#include "recording.h"
+
+namespace senseloom::tool {
+namespace {
+
+// What is recorded of the one session that each of the programs has.
+constexpr char kSession[] = R"({"call":"open","session":"s1","sensor":"LPE_P","returned":"handle"}
+{"call":"dispatch","session":"s1","record":{"hex":"01000000000000000200"},"returned":1,"result":{"hex":"01000000000000000200"}}
+{"call":"close","session":"s1","returned":0}
+)";
+
+Environment withLibraryFolder() {
+  return {{"LD_LIBRARY_PATH", std::filesystem::path(LIBRARY_FILE).parent_path()}};
+}
+
+void expectRecorded(const std::vector<std::string>& command, const Environment& environment = {}) {
+  const ScratchFile trace("kind");
+  const ToolRun run = recordTo(trace.name, command, "", environment);
+  EXPECT_EQ(run.status, 0) << run.err;
+  EXPECT_EQ(callsOf(contentOf(trace.name)), kSession);
+  EXPECT_EQ(check(trace.name).out, "3 calls compared, all as recorded\n");
+}
+
+TEST(RecordKinds, ALibraryThatIsLoadedByItsName) {
+  expectRecorded({LOADER_FILE, LIBRARY_NAME}, withLibraryFolder());
+}
+
+TEST(RecordKinds, ALibraryThatIsLoadedByItsPath) {
+  expectRecorded({LOADER_FILE, LIBRARY_FILE});
+}
+
+TEST(RecordKinds, ALibraryThatIsBoundDeeply) {
+#ifdef SANITIZED
+  GTEST_SKIP() << "the sanitizer refuses that";
+#endif
+  expectRecorded({LOADER_FILE, LIBRARY_FILE, "deep"});
+  expectRecorded({LOADER_FILE, PLUGIN_FILE, "deep"});
+}
+
+TEST(RecordKinds, ALibraryThatIsSeenByEverybody) {
+  expectRecorded({LOADER_FILE, LIBRARY_FILE, "global"});
+}
+
+TEST(RecordKinds, ALibraryThatAPlugInNeeds) {
+  expectRecorded({LOADER_FILE, PLUGIN_FILE});
+}
+
+TEST(RecordKinds, AProgramThatAScriptStarts) {
+  expectRecorded({"sh", "-c", std::string(LOADER_FILE) + " " + LIBRARY_FILE});
+}
+
+TEST(RecordKinds, ALibraryThatPythonLoads) {
+#ifdef SANITIZED
+  GTEST_SKIP() << "the program does not have the sanitizer that the library needs";
+#endif
+  if (sizeof(void*) != 8) GTEST_SKIP() << "Python has the host's word size";
+  const std::string program = std::string("import ctypes\nlibrary = ctypes.CDLL('") + LIBRARY_FILE + R"(')
+library.ctx_open_session.restype = ctypes.c_void_p
+session = ctypes.c_void_p(library.ctx_open_session(b'LPE_P'))
+record = ctypes.create_string_buffer(bytes.fromhex('01000000000000000200'), 10)
+result, size = ctypes.c_void_p(), ctypes.c_int()
+library.ctx_dispatch_data(session, record, 10, ctypes.byref(result), ctypes.byref(size))
+assert ctypes.c_bool.in_dll(library, 'gIsActivated').value
+library.ctx_close_session(session, ctypes.byref(result))
+)";
+  expectRecorded({"/usr/bin/python3", "-c", program});
+}
+
+// As on a device: nothing is loaded by the linker's auditing interface, the files have each other's names.
+TEST(RecordKinds, ALibraryThatTheRecordingLibraryStandsInThePlaceOf) {
+  const ScratchFolder folder("in_place");
+  std::filesystem::create_symlink(RECORDER_LIBRARY, folder.file(LIBRARY_NAME));
+  std::filesystem::create_symlink(LIBRARY_FILE, folder.file("libsenseloom-real.so"));
+  Environment environment = recordingEnvironment();
+  environment.emplace_back("LD_LIBRARY_PATH", folder.name);
+  environment.emplace_back("SENSELOOM_TRACE", folder.file("trace"));
+  const ToolRun run = runTool({"replay", "--quiet", "audio_classification.jsonl"}, "", environment);
+  EXPECT_EQ(run.status, 0) << run.err;
+  EXPECT_EQ(check(folder.file("trace")).status, 0);
+}
+
+TEST(RecordKinds, RefusesAProgramThatIsLinkedStatically) {
+  const ScratchFile trace("static");
+  const ToolRun run = recordTo(trace.name, {STATIC_FILE});
+  EXPECT_EQ(run.err,
+            "senseloom: " + std::string(STATIC_FILE) + ": it is linked statically, so it cannot be recorded\n");
+  EXPECT_EQ(run.status, 2);
+  EXPECT_FALSE(std::filesystem::exists(trace.name));
+}
+
+TEST(RecordKinds, RefusesAProgramThatRunsWithThePrivilegesOfItsFile) {
+  if (geteuid() != 0) GTEST_SKIP() << "only root can make a file of somebody else's";
+  const ScratchFolder folder("privileged");
+  const std::string program = folder.file("program");
+  std::filesystem::copy_file(LOADER_FILE, program);
+  ASSERT_EQ(chown(program.c_str(), 65534, 65534), 0);
+  ASSERT_EQ(chmod(program.c_str(), 04755), 0);
+  const ToolRun run = recordTo(folder.file("trace"), {program, LIBRARY_FILE});
+  EXPECT_EQ(run.err, "senseloom: " + program + ": it runs with the privileges of its file, so it cannot be recorded\n");
+  EXPECT_EQ(run.status, 2);
+  EXPECT_FALSE(std::filesystem::exists(folder.file("trace")));
+}
+
+}  // namespace
+}  // namespace senseloom::tool

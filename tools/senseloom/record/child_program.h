@@ -1,0 +1,34 @@
+#pragma once
+
+#include <sys/types.h>
+
+#include <string>
+#include <vector>
+
+#include "exit_status.h"
+
+namespace senseloom::tool {
+
+// A program that the tool has started. While it runs, the tool does not end by signals that ask it to: those that a
+// process sends are passed on, those from the keyboard the program gets by itself.
+class ChildProgram {
+ public:
+  // `order` becomes the program's SENSELOOM_TRACE, `audit` is loaded by its LD_AUDIT, and `out` becomes its standard
+  // output. Throws InputError when it cannot be started.
+  ChildProgram(std::vector<std::string> command, const std::string& order, const std::string& audit, int out);
+  ChildProgram(const ChildProgram&) = delete;
+  ChildProgram& operator=(const ChildProgram&) = delete;
+
+  // Whether it has ended.
+  bool hasEnded();
+  ExitStatus status() const;
+  // The signal that ended it, as text; empty if none did.
+  std::string cause() const;
+
+ private:
+  pid_t process = 0;
+  int waitStatus = 0;
+  bool isOver = false;
+};
+
+}  // namespace senseloom::tool
