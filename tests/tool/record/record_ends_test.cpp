@@ -58,6 +58,7 @@ TEST(RecordEnds, TellsOfASignalFromAnotherProcessToTheProgram) {
   BackgroundProgram tool({TOOL_FILE, "record", "-o", trace.name, "--", DRIVEN_FILE}, recordingEnvironment());
   EXPECT_EQ(tool.ask("open a LIFT"), "1");
   tool.send(SIGTERM);
+  EXPECT_EQ(tool.readLine(), "") << "before the end of its input";
   const ToolRun run = tool.finish();
   EXPECT_EQ(run.status, -1);
   EXPECT_EQ(run.err, summaryOf(1, trace.name));
