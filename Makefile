@@ -2,11 +2,11 @@
 SHELL := /bin/bash
 
 .DEFAULT_GOAL := demo
-.PHONY: demo test accuracy bench bench-count fuzz coverage memcheck mutants lint
+.PHONY: demo test install packages check-packages release accuracy bench bench-count fuzz coverage memcheck mutants lint
 .SILENT:
 
-# $(call build,PRESET,CMAKE ARGUMENTS,TARGET): quietly, unless it fails.
-build = { cmake --preset $(1) $(2) && cmake --build --preset $(1) $(3:%=--target %); } >build/$(1).log 2>&1 || { cat build/$(1).log; exit 1; }
+# $(call build,PRESET,CMAKE ARGUMENTS,TARGET): quietly but for where it is done, unless it fails.
+build = echo "Building in build/$(1), which can take some minutes; build/$(1).log shows how far it is." >&2; { cmake --preset $(1) $(2) && cmake --build --preset $(1) $(3:%=--target %); } >build/$(1).log 2>&1 || { cat build/$(1).log; exit 1; }
 
 # $(call install,TASKS)
 install = mkdir -p build && scripts/install-deps.sh $(1)
@@ -26,6 +26,35 @@ test:
 	  $(call build,$$preset,-DBUILD_TESTING=ON); \
 	  ctest --preset $$preset || exit 1; \
 	done
+
+# Installs the library in the host's word size, the tool and the documentation below PREFIX. BUILD is the folder to build
+# them in.
+PREFIX := /usr/local
+BUILD := build/install
+install:
+	$(call install,build)
+	echo "Building in $(BUILD), which can take some minutes."
+	[ -e $(BUILD)/CMakeCache.txt ] || cmake -G Ninja -B $(BUILD) -D BUILD_TESTING=OFF >/dev/null
+	cmake --build $(BUILD) && cmake --install $(BUILD) --prefix $(PREFIX)
+
+# Makes the Debian packages, of the library in both word sizes, and checks them by lintian.
+packages:
+	$(call install,build packages)
+	rm -rf build/packages
+	for preset in $$(scripts/host-presets.sh x86 native); do \
+	  $(call build,$$preset,-DBUILD_TESTING=OFF); \
+	  packaging/make_debs.py build/$$preset build/packages || exit 1; \
+	done
+	lintian --allow-root --fail-on error,warning build/packages/*.deb
+	ls build/packages/*.deb
+
+# Installs the packages into a new Debian system in a folder, and uses them there. Takes root and some minutes.
+check-packages: packages
+	packaging/check_in_chroot.sh build/packages
+
+# Makes a release of the version in include/senseloom.h: tested packages, notes and a tag. CONTRIBUTING.md says more.
+release:
+	scripts/release.sh
 
 # Prints how well digits are recognised that were not learned from; of the recordings in DATA, a folder laid out as data/.
 DATA := data

@@ -1,4 +1,4 @@
-# Installation, what other projects find the library by, and Debian packages.
+# Installation, and what other projects find the library by. Debian packages are made of the components: see packaging/.
 
 # A folder for each word size, as Debian has it: both can be installed side by side.
 if(CMAKE_LIBRARY_ARCHITECTURE)
@@ -29,6 +29,16 @@ install(FILES LICENSE data/NOTICE TYPE DOC COMPONENT library) # the latter: what
 install(FILES include/senseloom.h include/senseloom.hpp TYPE INCLUDE COMPONENT development)
 install(FILES docs/man/libsenseloom.3 DESTINATION ${CMAKE_INSTALL_MANDIR}/man3 COMPONENT development)
 install(FILES docs/man/senseloom-options.7 DESTINATION ${CMAKE_INSTALL_MANDIR}/man7 COMPONENT development)
+# Every function that the page names has a page that leads to it.
+file(STRINGS docs/man/libsenseloom.3 synopses REGEX "^[a-z_0-9]+ \\*?[A-Za-z_]+\\(")
+foreach(synopsis IN LISTS synopses)
+  string(REGEX REPLACE "^[a-z_0-9]+ \\*?([A-Za-z_]+)\\(.*" "\\1" function "${synopsis}")
+  file(CONFIGURE OUTPUT man3/${function}.3 CONTENT ".so man3/libsenseloom.3\n")
+  install(
+    FILES ${PROJECT_BINARY_DIR}/man3/${function}.3
+    DESTINATION ${CMAKE_INSTALL_MANDIR}/man3
+    COMPONENT development)
+endforeach()
 # What CMake and pkg-config find the library by. Both tell where it is from where they are, so an installed tree can be
 # moved.
 set(package_dir ${CMAKE_INSTALL_LIBDIR}/cmake/senseloom)
@@ -49,48 +59,25 @@ install(
   COMPONENT development)
 
 install(TARGETS senseloom_cli RUNTIME COMPONENT tool)
-install(TARGETS senseloom_recorder senseloom_audit LIBRARY DESTINATION ${platform_dir} COMPONENT tool)
+install(TARGETS senseloom_recorder senseloom_audit LIBRARY DESTINATION ${platform_dir} COMPONENT recorder)
 install(FILES docs/man/senseloom.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1 COMPONENT tool)
 install(
   FILES tools/senseloom/completion.bash
   DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions
   RENAME senseloom
   COMPONENT tool)
-install(FILES README.md CHANGELOG.md TYPE DOC COMPONENT tool)
+# The pages and what they lead to, laid out as here.
+install(FILES README.md CHANGELOG.md CONTRIBUTING.md SECURITY.md TYPE DOC COMPONENT tool)
 install(
   DIRECTORY docs examples
   TYPE DOC
   COMPONENT tool
-  PATTERN docs/man EXCLUDE)
-
-# Debian packages, one a component, for the word size of the build: `cpack` in the build's folder.
-set(CPACK_GENERATOR DEB)
-set(CPACK_VERBATIM_VARIABLES ON)
-set(CPACK_PACKAGE_VENDOR senseloom)
-set(CPACK_PACKAGE_CONTACT "senseloom maintainers <maintainers@senseloom.example>")
-set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "context sensors shared by many clients")
-set(CPACK_PACKAGING_INSTALL_PREFIX /usr)
-set(CPACK_STRIP_FILES ON)
-set(CPACK_COMPONENTS_ALL library development tool)
-set(CPACK_DEB_COMPONENT_INSTALL ON)
-set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
-if(CMAKE_LIBRARY_ARCHITECTURE MATCHES "^i[3-6]86-")
-  set(CPACK_DEBIAN_PACKAGE_ARCHITECTURE i386) # else the host's
-endif()
-# Dependencies are read off the programs: on each other exactly, on Debian's libraries from the version that has the
-# symbols.
-set(CPACK_DEBIAN_ENABLE_COMPONENT_DEPENDS ON)
-set(CPACK_COMPONENT_DEVELOPMENT_DEPENDS library)
-set(CPACK_COMPONENT_TOOL_DEPENDS library)
-set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
-set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS ${CMAKE_LIBRARY_OUTPUT_DIRECTORY})
-set(CPACK_DEBIAN_LIBRARY_PACKAGE_NAME libsenseloom${PROJECT_VERSION_MAJOR})
-set(CPACK_DEBIAN_LIBRARY_PACKAGE_SECTION libs)
-set(CPACK_COMPONENT_LIBRARY_DESCRIPTION "The shared library, and what stands in for the platform on a host.")
-set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_NAME libsenseloom-dev)
-set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_SECTION libdevel)
-set(CPACK_COMPONENT_DEVELOPMENT_DESCRIPTION "Headers for C and C++, and what pkg-config and CMake find them by.")
-set(CPACK_DEBIAN_TOOL_PACKAGE_NAME senseloom)
-set(CPACK_DEBIAN_TOOL_PACKAGE_SECTION utils)
-set(CPACK_COMPONENT_TOOL_DESCRIPTION "The tool that replays, records and explains traces of the library's calls.")
-include(CPack)
+  PATTERN docs/man EXCLUDE
+  PATTERN Doxyfile EXCLUDE)
+foreach(file platform/README.md data/README.md data/activity/decisions.csv bench/README.md bench/count/counts.txt)
+  get_filename_component(folder ${file} DIRECTORY)
+  install(
+    FILES ${file}
+    DESTINATION ${CMAKE_INSTALL_DOCDIR}/${folder}
+    COMPONENT tool)
+endforeach()

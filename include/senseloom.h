@@ -30,6 +30,14 @@
 #include <stdbool.h>
 #include <stdint.h>
 
+/**
+ * The version of this header, MAJOR.MINOR.PATCH. A program runs with libraries of the same major version, from the minor
+ * version on that it was compiled with.
+ */
+#define SENSELOOM_VERSION_MAJOR 1
+#define SENSELOOM_VERSION_MINOR 0 /**< goes up when something is added */
+#define SENSELOOM_VERSION_PATCH 0 /**< goes up when faults are repaired and nothing is added */
+
 /** Marks what the library exports. */
 #define SENSELOOM_API __attribute__((visibility("default")))
 

@@ -14,6 +14,10 @@
 #ifndef SENSELOOM_HPP
 #define SENSELOOM_HPP
 
+#if __cplusplus <= 201703L
+#error "senseloom.hpp needs C++20: compile with -std=c++20, or use senseloom.h."
+#else
+
 #include <climits>
 #include <cstddef>
 #include <cstdint>
@@ -195,4 +199,5 @@ class Session {
 }  // namespace v1
 }  // namespace senseloom
 
+#endif
 #endif

@@ -2,13 +2,14 @@
 # Installs what building, testing or another task needs and the machine lacks, from Debian's packages. Prints nothing
 # when nothing is missing.
 #
-#   scripts/install-deps.sh [TASK...]    tasks: build (the default), test, bench, fuzz, coverage, lint
+#   scripts/install-deps.sh [TASK...]    tasks: build (the default), test, packages, bench, fuzz, coverage, lint
 set -euo pipefail
 
 # Per task: packages that are programs or headers, and libraries, which 32-bit x86 needs in its own version, too.
 declare -A programs=(
   [build]="g++ cmake ninja-build libcli11-dev zlib1g-dev"
-  [test]="abigail-tools binutils clang clang-13 doxygen dpkg-dev file groff-base libc++-dev libc++abi-dev lld locales pkg-config python3 python3-jsonschema python3-numpy valgrind"
+  [test]="abigail-tools binutils clang clang-13 doxygen dpkg-dev file groff-base libc++-dev libc++abi-dev lintian lld locales pkg-config python3 python3-jsonschema python3-numpy valgrind"
+  [packages]="dpkg-dev lintian mmdebstrap python3"
   [bench]="libboost-dev librange-v3-dev"
   [fuzz]="clang libclang-rt-14-dev" # brings the runtime libraries of both word sizes
   [coverage]="clang libclang-rt-14-dev llvm"
@@ -17,6 +18,7 @@ declare -A programs=(
 declare -A libraries=(
   [build]="libjansson-dev android-liblog-dev libzstd-dev zlib1g"
   [test]="libc6-dbg libgtest-dev"
+  [packages]=""
   [bench]="libbenchmark-dev libsigc++-2.0-dev"
   [fuzz]=""
   [coverage]=""
