@@ -20,6 +20,7 @@ for word in "amd64 64 x86_64-linux-gnu" "i386 32 i386-linux-gnu"; do
   read -r architecture bits triplet <<<"$word"
   echo "Using the packages of $architecture"
   for package in libsenseloom1 libsenseloom-dev senseloom-recorder; do
+    # shellcheck disable=SC2016 # fields of dpkg's
     in_root dpkg-query --show --showformat '${db:Status-Status} ${Package}:${Architecture}\n' "$package:$architecture" |
       grep -qx "installed $package:$architecture"
   done

@@ -10,7 +10,7 @@ for page in "$1"/man*/*; do
     grep -qE "^\.SH \"?$section\"?$" "$page" || { echo "$page has no section $section"; exit 1; }
   done
 done
-for function in $(sed -n 's/ T$//p' "$2"); do
+while read -r function; do
   grep -qx '\.so man3/libsenseloom\.3' "$1/man3/$function.3" || { echo "no page leads from $function"; exit 1; }
   grep -qxE "$function,?" "$1/man3/libsenseloom.3" || { echo "libsenseloom(3) does not name $function"; exit 1; }
-done
+done < <(sed -n 's/ T$//p' "$2")
