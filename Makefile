@@ -54,7 +54,7 @@ check-packages: packages
 
 # Makes a release of the version in include/senseloom.h: tested packages, notes and a tag. CONTRIBUTING.md says more.
 release:
-	scripts/release.sh
+	scripts/release.sh $(MAKE)
 
 # Prints how well digits are recognised that were not learned from; of the recordings in DATA, a folder laid out as data/.
 DATA := data

@@ -1,6 +1,7 @@
 #!/usr/bin/env bash
 # Fails unless `make demo` says what it does before it begins to build: check_demo_says.sh SOURCE
 set -euo pipefail
+unset MAKEFLAGS MAKELEVEL # of a make that runs this
 folder=$(mktemp -d)
 trap 'rm -rf "$folder"' EXIT
 mkdir -p "$folder/scripts" "$folder/stand_in"
