@@ -26,9 +26,11 @@ for word in "amd64 64 x86_64-linux-gnu" "i386 32 i386-linux-gnu"; do
   done
   gcc "-m$bits" -I "$root/usr/include" -o "$root/embed" "$sources/examples/embed.c" \
     -L "$root/usr/lib/$triplet" -lsenseloom -Wl,--allow-shlib-undefined
-  in_root /embed | grep -qx "voter: class 3"
+  in_root /embed 2>/dev/null | grep -qx "voter: class 3"
+  in_root senseloom record -o "/$bits.jsonl" -- /embed >"$root/log" 2>&1 || { cat "$root/log"; exit 1; }
+  in_root senseloom replay --check "/$bits.jsonl"
 done
-in_root senseloom replay --quiet /usr/share/doc/senseloom/examples/audio_classification.jsonl | grep -q LPE_P
+in_root senseloom replay --log none --quiet /usr/share/doc/senseloom/examples/audio_classification.jsonl | grep -q LPE_P
 
 echo "Removing the packages"
 in_root sh -c "apt-get purge -y '?name(senseloom)'" >"$root/log" 2>&1 || { cat "$root/log"; exit 1; }
