@@ -49,9 +49,12 @@ Verdict Activity::judge(Record record, Outcome& outcome) {
     return {Fate::delivered};
   }
   if (!record.empty()) {
-    if (!has<int16_t>(record, kValueOffset)) return {Fate::refused};
+    if (!has<int16_t>(record, kValueOffset)) return refused(Refusal::noCount);
     const auto count = at<int16_t>(record, kValueOffset);
-    if (count > 0 && kItemsOffset + 2 * static_cast<size_t>(count) > record.size()) return {Fate::refused};
+    const size_t room = (record.size() - kItemsOffset) / 2;
+    if (count > 0 && static_cast<size_t>(count) > room) {
+      return refused(Refusal::itemsMissing, static_cast<size_t>(count), room);
+    }
     std::copy_n(record.begin(), std::min(record.size(), work.size()), work.begin());
   }
   const auto declared = std::clamp<int>(at<int16_t>(work, kValueOffset), 0, kMostItems);
@@ -119,7 +122,9 @@ size_t Activity::restart(const Request& request, int32_t leastLogM) {
   const size_t cutOff = batch.size();
   batch.clear();
   reported.reset();
-  plan = Plan{.batchSize = size_t{1} << ((request.value("logN") - leastLogM) & 31),
+  plan = Plan{.logN = request.value("logN"),
+              .leastLogM = leastLogM,
+              .batchSize = size_t{1} << ((request.value("logN") - leastLogM) & 31),
               .votes = request.value("summary") != 0,
               .weightVar = request.value("weightVar"),
               .classMask = request.value("classMask"),
@@ -129,7 +134,8 @@ size_t Activity::restart(const Request& request, int32_t leastLogM) {
 
 std::string Activity::chain() const {
   if (!plan) return "none yet: records pass as they are";
-  std::string text = "batches of " + std::to_string(plan->batchSize);
+  std::string text = "batches of " + std::to_string(plan->batchSize) + " = 2^(logN " + std::to_string(plan->logN) +
+                     " - merged logM " + std::to_string(plan->leastLogM) + ')';
   if (plan->votes) text += ", voted (" + weightsText(plan->batchSize, plan->weightVar) + ')';
   text += plan->classMask == -1 ? ", all classes" : ", mask " + std::to_string(plan->classMask);
   return text + (plan->onChange ? ", on change" : "");

@@ -36,6 +36,8 @@ class Activity {
  private:
   static constexpr size_t kMostItems = 256;
   struct Plan {
+    int32_t logN;
+    int32_t leastLogM;
     size_t batchSize;
     bool votes;
     int32_t weightVar;

@@ -8,6 +8,12 @@ namespace {
 constexpr const char* kAudioTag = "aware_audio";
 constexpr uint32_t kVersion = 0x200;
 
+// Says why the session is not switched, with the line that was logged about it.
+bool fail(Outcome& outcome, const char* cause, const std::string& logged) {
+  outcome.why.remarks.push_back(audioNotSwitched(cause, logged));
+  return false;
+}
+
 }  // namespace
 
 bool Audio::open(const Answers& answers, Outcome& outcome) {
@@ -18,13 +24,14 @@ bool Audio::open(const Answers& answers, Outcome& outcome) {
   outcome.calls.emplace_back("get aware.primary");
   write(outcome.log, kDebug, kAudioTag, "bool audio_hal_init() load audio hw module aware.primary (%s)",
         std::strerror(-answers.get));
-  if (answers.get != 0) return false;
+  if (answers.get != 0) return fail(outcome, "on: no module is loaded", "");
   outcome.calls.emplace_back("open aware_hw_if");
-  write(outcome.log, kDebug, kAudioTag, "device open result %d\n", answers.open);
-  if (answers.open != 0 || !answers.gives) return false;
+  const std::string& opened = write(outcome.log, kDebug, kAudioTag, "device open result %d\n", answers.open);
+  if (answers.open != 0 || !answers.gives) return fail(outcome, "on: the module opens no device", opened);
   isOpen = true;
-  write(outcome.log, kDebug, kAudioTag, "device version %d\n", static_cast<int>(answers.version));
-  return answers.version == kVersion;
+  const std::string& version =
+      write(outcome.log, kDebug, kAudioTag, "device version %d\n", static_cast<int>(answers.version));
+  return answers.version == kVersion || fail(outcome, "on: the device's version is not 2.0", version);
 }
 
 bool Audio::activate(const Answers& answers, const void* address, Outcome& outcome) {
@@ -42,7 +49,7 @@ bool Audio::activate(const Answers& answers, const void* address, Outcome& outco
   if (isActive) {
     write(outcome.log, kDebug, kAudioTag, "activated aware successful...\n");
   } else {
-    write(outcome.log, kError, kAudioTag, "activated aware failed\n");
+    fail(outcome, "on: the device refuses", write(outcome.log, kError, kAudioTag, "activated aware failed\n"));
   }
   return isActive;
 }
@@ -59,8 +66,8 @@ bool Audio::deactivate(const Answers& answers, Outcome& outcome) {
   outcome.calls.emplace_back("puts deactivating aware session...");
   outcome.calls.emplace_back("deactivate");
   if (answers.deactivate != 0) {
-    write(outcome.log, kError, kAudioTag, "deactivated aware session failed \n");
-    return false;
+    return fail(outcome, "off: the device refuses",
+                write(outcome.log, kError, kAudioTag, "deactivated aware session failed \n"));
   }
   write(outcome.log, kDebug, kAudioTag, "deactivated aware session successful... \n");
   outcome.calls.emplace_back("close");

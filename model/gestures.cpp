@@ -24,7 +24,9 @@ constexpr const char* kNames[] = {"NumberOne ",  "NumberTwo ",  "NumberThree ", 
 void Gestures::sessionOpened(const Answers& answers, Outcome& outcome) {
   if (++sessions > 1) return;
   ++outcome.engineStarts;
-  if (!answers.starts) write(outcome.log, kError, kTag, "hmm gesture algorithm start return false");
+  if (answers.starts) return;
+  const std::string& line = write(outcome.log, kError, kTag, "hmm gesture algorithm start return false");
+  outcome.why.remarks.push_back(engineNotStarted(line));
 }
 
 void Gestures::sessionClosed(Outcome& outcome) {
@@ -32,8 +34,13 @@ void Gestures::sessionClosed(Outcome& outcome) {
 }
 
 Verdict Gestures::judge(int32_t classMask, Record record, const Answers& answers, Outcome& outcome) {
-  if (record.size() < kFewestBytes || record.size() > kMostBytes) return {Fate::refused};
-  if (kSamplesOffset + at<uint16_t>(record, kSizeOffset) > record.size()) return {Fate::refused};
+  if (record.size() < kFewestBytes || record.size() > kMostBytes) {
+    return refused(Refusal::wrongSize, record.size(), kMostBytes);
+  }
+  const size_t room = record.size() - kSamplesOffset;
+  if (const auto size = at<uint16_t>(record, kSizeOffset); size > room) {
+    return refused(Refusal::samplesMissing, size, room);
+  }
   if (const auto now = at<uint64_t>(record, kTimestampOffset); now != timestamp) {
     timestamp = now;
     classNumber = 0;

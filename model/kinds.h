@@ -52,6 +52,7 @@ struct Key {
   const char* message = nullptr;  // format of the line logged about a value out of range; null: none
   Rule merge = Rule::keepFirst;
   const char* means = nullptr;  // what it asks for, for people
+  bool hasEffect = true;        // on a property or on what a session delivers
 
   constexpr bool takes(int32_t value) const { return low <= value && value <= high; }
 };
@@ -68,6 +69,7 @@ struct PropertyRow {
   const char* name;
   const char* key = nullptr;    // whose value it shows; null: the value is computed
   const char* means = nullptr;  // of a computed value, for people
+  bool hasHalves = false;       // of 16 bits each, which are two numbers
 };
 
 struct KindRow {
@@ -119,10 +121,11 @@ inline constexpr KindRow kKindTable[] = {
                .high = 1,
                .fallback = 1,
                .merge = Rule::anySet,
-               .means = "no effect: it is read and merged, but in no property and used by no session"}},
+               .means = "no effect: it is read and merged, but in no property and used by no session",
+               .hasEffect = false}},
      .properties = {{41, "mode", "mode"},
                     {43, "spans", nullptr,
-                     "2^logN: in the high 16 bits for the largest logN as given, in the low 16 for the smallest"},
+                     "2^logN: in the high 16 bits for the largest logN as given, in the low 16 for the smallest", true},
                     {44, "decisionsPerSpan", nullptr,
                      "2^(logN - logM), of the merged values: what the sensor decides in the shortest span"},
                     {42, "classMask", "classMask"}},

@@ -8,6 +8,7 @@
 #include <string_view>
 #include <utility>
 
+#include "duplicate_keys.h"
 #include "nearest_name.h"
 
 namespace senseloom::model {
@@ -27,7 +28,7 @@ class Reader {
     json_error_t error{};
     const Json root(hasMemory ? json_loads(text, 0, &error) : nullptr);
     if (root == nullptr) return readNotJson(text, error.text);
-    if (place.remarks != nullptr) remarkOnKeys(root.get());
+    if (place.remarks != nullptr) remarkOnKeys(root.get(), text);
     if (!storeTemplates(root.get())) return false;
 
     Request given(request.kind());
@@ -59,8 +60,9 @@ class Reader {
     return row.acceptsNotJson;
   }
 
-  void remarkOnKeys(json_t* root) {
+  void remarkOnKeys(json_t* root, const char* text) {
     if (!json_is_object(root)) remark(notAnObject);
+    for (const std::string& key : keysGivenTwice(text)) remark(givenTwice, key);
     std::vector<std::string_view> known;
     for (const StringKey& key : row.stringKeys) known.emplace_back(key.name);
     for (const Key& key : row.keys) known.emplace_back(key.name);
@@ -93,6 +95,7 @@ class Reader {
       const int64_t whole = json_integer_value(value);
       const auto number = static_cast<int32_t>(whole);
       if (number != whole) remark(cutTo32Bits, key.name, whole, number);
+      if (!key.hasEffect) remark(withoutEffect, key);
       return {number, number, false};
     }
     if (value != nullptr) remark(notAnInteger, key.name);

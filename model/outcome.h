@@ -56,11 +56,12 @@ struct SampleGroup {
   bool operator==(const SampleGroup&) const = default;
 };
 
-// Why a call came to what it came to. The counts and the verdict are always there, the rest when it is asked for.
+// Why a call came to what it came to. What is about an option string, and the negotiation, are there when they are
+// asked for.
 struct Explanation {
   Verdict verdict = {};              // on a dispatched record
   ItemCounts items = {};             // of the dispatched record, or of the session that closes
-  std::vector<Remark> remarks = {};  // about an option string
+  std::vector<Remark> remarks = {};  // about an option string, and about what the platform does not do
   std::optional<Negotiation> negotiation = {};
   bool operator==(const Explanation&) const = default;
 };

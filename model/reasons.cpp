@@ -25,6 +25,17 @@ constexpr FateRow kFateRows[kFates] = {
     {"refused", ""},
 };
 
+// Formats of a refusal's two numbers, in the order of the refusals.
+constexpr const char* kRefusals[] = {
+    ": its session is not open",
+    ": ends before its number of items",
+    ": says that it has %d items",
+    ": says that it has %d items, and has room for %d",
+    ": with it, %d items would be gathered, where %d have room",
+    ": has %d bytes, where 24 to %d are taken",
+    ": says that its samples have %d bytes, and has room for %d",
+};
+
 const FateRow& fateRow(Fate fate) {
   return kFateRows[static_cast<size_t>(fate)];
 }
@@ -32,13 +43,14 @@ const FateRow& fateRow(Fate fate) {
 struct CountRow {
   size_t ItemCounts::*count;
   const char* text;
+  bool isLoss;
 };
 constexpr CountRow kCountRows[] = {
-    {&ItemCounts::beyondBatch, "items beyond a full batch: "},
-    {&ItemCounts::cutOff, "items lost when a negotiation cut their batch off: "},
-    {&ItemCounts::withoutMajority, "results without a majority (class 6): "},
-    {&ItemCounts::masked, "items delivered as class 0 for the mask: "},
-    {&ItemCounts::gathered, "items gathered and not delivered: "},
+    {&ItemCounts::beyondBatch, "items beyond a full batch: ", true},
+    {&ItemCounts::cutOff, "items lost when a negotiation cut their batch off: ", true},
+    {&ItemCounts::withoutMajority, "results without a majority (class 6): ", false},
+    {&ItemCounts::masked, "items delivered as class 0 for the mask: ", false},
+    {&ItemCounts::gathered, "items gathered and not delivered: ", true},
 };
 
 std::string quoted(std::string_view text) {
@@ -68,9 +80,14 @@ int Verdict::returned() const {
 }
 
 std::string Verdict::text() const {
-  std::array<char, 64> numbers;
-  std::snprintf(numbers.data(), numbers.size(), fateRow(fate).numbers, first, second);
+  std::array<char, 96> numbers;
+  const char* format = fate == Fate::refused ? kRefusals[static_cast<size_t>(refusal)] : fateRow(fate).numbers;
+  std::snprintf(numbers.data(), numbers.size(), format, first, second);
   return std::string(fateText(fate)) + numbers.data();
+}
+
+Verdict refused(Refusal why, size_t first, size_t second) {
+  return {Fate::refused, static_cast<int32_t>(first), static_cast<int32_t>(second), why};
 }
 
 ItemCounts& ItemCounts::operator+=(const ItemCounts& other) {
@@ -78,13 +95,12 @@ ItemCounts& ItemCounts::operator+=(const ItemCounts& other) {
   return *this;
 }
 
-std::string ItemCounts::text() const {
-  std::string text;
+std::vector<ItemCount> ItemCounts::told() const {
+  std::vector<ItemCount> told;
   for (const CountRow& row : kCountRows) {
-    if (this->*row.count == 0) continue;
-    text += (text.empty() ? "" : ", ") + (row.text + std::to_string(this->*row.count));
+    if (this->*row.count > 0) told.push_back({row.text + std::to_string(this->*row.count), row.isLoss});
   }
-  return text;
+  return told;
 }
 
 Remark nullText() {
@@ -98,6 +114,14 @@ Remark notJson(const std::string& error, bool isAccepted, std::string logged) {
 
 Remark notAnObject() {
   return {"not an object, so that every key has its default"};
+}
+
+Remark givenTwice(const std::string& key) {
+  return {quoted(key) + " is given more than once: the last value counts"};
+}
+
+Remark withoutEffect(const Key& key) {
+  return {quoted(key.name) + " has no effect: no property shows it, and no session uses it"};
 }
 
 Remark unknownKey(const std::string& key, std::string_view nearest) {
@@ -144,6 +168,14 @@ Remark refusedValue(const Key& key, int32_t value, std::string logged) {
 
 Remark refusedTemplate(const std::string& key, std::string logged) {
   return {quoted(key) + " is no template of at most 900 bytes: the whole option is refused", std::move(logged)};
+}
+
+Remark engineNotStarted(std::string logged) {
+  return {"the platform's gesture engine does not start: no gesture may be recognised", std::move(logged)};
+}
+
+Remark audioNotSwitched(const char* cause, std::string logged) {
+  return {std::string("the platform's audio session cannot be switched ") + cause, std::move(logged)};
 }
 
 Remark severalEnroll(std::string logged) {

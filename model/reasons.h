@@ -31,17 +31,37 @@ inline constexpr size_t kFates = 9;
 
 const char* fateText(Fate fate);
 
+// Why a record is refused.
+enum class Refusal {
+  notOpen,
+  noCount,
+  negativeCount,
+  itemsMissing,
+  tooManyItems,
+  wrongSize,
+  samplesMissing,
+};
+
 // A fate with the two numbers that made it so.
 struct Verdict {
   Fate fate = Fate::refused;
   int32_t first = 0;
   int32_t second = 0;
+  Refusal refusal = Refusal::notOpen;  // of those that are refused
 
   // What ctx_dispatch_data() returns for it.
   int returned() const;
   // The fate with its numbers.
   std::string text() const;
   bool operator==(const Verdict&) const = default;
+};
+
+Verdict refused(Refusal why, size_t first = 0, size_t second = 0);
+
+// A count of items, for people.
+struct ItemCount {
+  std::string text;
+  bool isLoss;  // no client got these items
 };
 
 // What becomes of a session's items, other than that they are delivered as they came.
@@ -53,14 +73,14 @@ struct ItemCounts {
   size_t gathered = 0;  // and not delivered
 
   ItemCounts& operator+=(const ItemCounts& other);
-  // Empty when there is nothing to tell.
-  std::string text() const;
+  // Those that are not 0.
+  std::vector<ItemCount> told() const;
   bool operator==(const ItemCounts&) const = default;
 };
 
 // --- options
 
-// Something about an option string that its client may not expect, and the line that the library logs about it.
+// Something about a call that its client may not expect, and the line that the library logs about it.
 struct Remark {
   std::string text;
   std::string logged = {};  // empty: nothing
@@ -70,6 +90,8 @@ struct Remark {
 Remark nullText();
 Remark notJson(const std::string& error, bool isAccepted, std::string logged);
 Remark notAnObject();
+Remark givenTwice(const std::string& key);
+Remark withoutEffect(const Key& key);
 Remark unknownKey(const std::string& key, std::string_view nearest);
 Remark notAnInteger(const std::string& key);
 Remark notAString(const std::string& key);
@@ -83,6 +105,12 @@ Remark refusedValue(const Key& key, int32_t value, std::string logged);
 Remark refusedTemplate(const std::string& key, std::string logged);
 Remark severalEnroll(std::string logged);
 Remark incompatibleMode(int32_t mode, std::string logged);
+
+// --- calls
+
+Remark engineNotStarted(std::string logged);
+// Why the platform's audio session cannot be switched on or off.
+Remark audioNotSwitched(const char* cause, std::string logged);
 
 // --- negotiations
 

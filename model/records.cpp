@@ -51,13 +51,15 @@ Verdict judgeAlone(const Request& request, Record record, Outcome& outcome) {
 }
 
 Verdict Gathering::judge(const Request& request, Record record, Outcome& outcome) {
-  if (!has<int16_t>(record, kValueOffset)) return {Fate::refused};
-  const auto count = at<int16_t>(record, kValueOffset);
-  if (count < 0) return {Fate::refused};
-  const size_t bytes = static_cast<size_t>(count) * kItemSize;
-  if (kItemsOffset + bytes > record.size()) return {Fate::refused};
-  const size_t gathered = pending() + static_cast<size_t>(count);
-  if (gathered > kMostItems) return {Fate::refused};
+  if (!has<int16_t>(record, kValueOffset)) return refused(Refusal::noCount);
+  const auto declared = at<int16_t>(record, kValueOffset);
+  if (declared < 0) return {Fate::refused, declared, 0, Refusal::negativeCount};
+  const auto count = static_cast<size_t>(declared);
+  const size_t room = (record.size() - kItemsOffset) / kItemSize;
+  if (count > room) return refused(Refusal::itemsMissing, count, room);
+  const size_t bytes = count * kItemSize;
+  const size_t gathered = pending() + count;
+  if (gathered > kMostItems) return refused(Refusal::tooManyItems, gathered, kMostItems);
   const auto given = record.subspan(kItemsOffset, bytes);
   items.insert(items.end(), given.begin(), given.end());
   const auto number = static_cast<int32_t>(gathered);

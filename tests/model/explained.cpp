@@ -11,6 +11,7 @@
 
 #include "client.h"
 #include "explain/explainer.h"
+#include "explain/explanation_text.h"
 #include "input_error.h"
 #include "trace/hex.h"
 #include "trace/replayer.h"
@@ -56,7 +57,8 @@ tool::TraceCall traceCallOf(const Call& call, size_t line) {
 // Makes the calls, and then closes what they left open, as the tool does at the end of a trace.
 void replay(const Sequence& sequence, std::FILE* out) {
   FakeLog log;
-  tool::Explainer explainer(out, log, true);
+  tool::ExplanationText output(out, {.records = true, .all = true});
+  tool::Explainer explainer(output, log);
   tool::Replayer replayer(explainer);
   const auto perform = [&](const Call& call, size_t line) {
     setAnswers(call.answers);

@@ -59,6 +59,12 @@ class Reasons : public testing::Test {
     return outcome.why.verdict.text();
   }
   // Records with a little-endian value of up to 8 bytes at byte 8.
+  // What is told of all items so far, a count a line.
+  static std::string told(const ItemCounts& counts) {
+    std::string text;
+    for (const ItemCount& count : counts.told()) text += (count.isLoss ? "lost: " : "") + count.text + '\n';
+    return text;
+  }
   static Bytes valued(int64_t value, size_t size, uint8_t timestamp = 1) {
     Bytes record(8 + size);
     record[0] = timestamp;
@@ -213,8 +219,7 @@ TEST_F(Reasons, CountGatheredItems) {
   Bytes one = valued(1, 2);
   one.resize(10 + 28);
   EXPECT_EQ(judged(map, one), "batch filling: 1 of 2 items");
-  EXPECT_EQ(judged(map, valued(-1, 2)), "refused");
-  EXPECT_EQ(model.close(map, true).why.items.text(), "items gathered and not delivered: 1");
+  EXPECT_EQ(told(model.close(map, true).why.items), "lost: items gathered and not delivered: 1\n");
 }
 
 TEST_F(Reasons, TellWhetherAGestureWasRecognised) {
@@ -240,19 +245,89 @@ TEST_F(Reasons, FollowTheBatchesOfActivity) {
   EXPECT_EQ(judged(nav, classes({})), "no items");
   EXPECT_EQ(judged(nav, classes({1})), "batch filling: 1 of 4 items");
   items += model.close(nav, true).why.items;
-  EXPECT_EQ(items.text(),
-            "items beyond a full batch: 2, items lost when a negotiation cut their batch off: 1, "
-            "results without a majority (class 6): 1, items delivered as class 0 for the mask: 1");
+  EXPECT_EQ(told(items),
+            "lost: items beyond a full batch: 2\n"
+            "lost: items lost when a negotiation cut their batch off: 1\n"
+            "results without a majority (class 6): 1\n"
+            "items delivered as class 0 for the mask: 1\n");
 }
 
 TEST_F(Reasons, DescribeTheChainOfActivity) {
   const auto chain = [&](const char* text) { return set(phyac, text).negotiation->participants.back().chain; };
   EXPECT_EQ(chain(R"({"logN":2,"weightVar":1,"mode":1,"classMask":12})"),
-            "batches of 4, voted (weights 1024 1536 2304 3456), mask 12, on change");
+            "batches of 4 = 2^(logN 2 - merged logM 0), voted (weights 1024 1536 2304 3456), mask 12, on change");
   EXPECT_EQ(chain(R"({"logN":4,"weightVar":3})"),
-            "batches of 16, voted (weights 1024 1152 1296 1458 1640 1845 ... 5985), all classes");
-  EXPECT_EQ(chain(R"({"summary":0,"weightVar":11})"), "batches of 1, all classes");
-  EXPECT_EQ(chain(R"({"logN":3,"weightVar":11})"), "batches of 8, voted (all weigh the same), all classes");
+            "batches of 16 = 2^(logN 4 - merged logM 0), "
+            "voted (weights 1024 1152 1296 1458 1640 1845 ... 5985), all classes");
+  EXPECT_EQ(chain(R"({"summary":0,"weightVar":11})"), "batches of 1 = 2^(logN 0 - merged logM 0), all classes");
+  EXPECT_EQ(chain(R"({"logN":3,"weightVar":11})"),
+            "batches of 8 = 2^(logN 3 - merged logM 0), voted (all weigh the same), all classes");
+}
+
+TEST_F(Reasons, TellWhyABatchHasItsSize) {
+  set(phyac, R"({"logN":5,"logM":2})");
+  EXPECT_EQ(set(phyac, R"({"logN":3,"logM":1})").negotiation->participants[0].chain,
+            "batches of 16 = 2^(logN 5 - merged logM 1), voted (all weigh the same), all classes");
+}
+
+TEST_F(Reasons, TellOfKeysThatAreGivenTwice) {
+  EXPECT_EQ(remarks(stap, R"({"level":1, "classMask" :1,"level"
+ :2,"l\u0065vel":3,"x":{"a":1,"a":2,"\"a\\":1},"classMask":2})"),
+            "\"level\" is given more than once: the last value counts\n"
+            "\"classMask\" is given more than once: the last value counts\n"
+            "unknown key \"x\" has no effect: the nearest known key is \"level\"\n");
+  EXPECT_EQ(remarks(stap, R"(["level","level"])"), "not an object, so that every key has its default\n");
+}
+
+TEST_F(Reasons, TellOfAKeyThatHasNoEffect) {
+  EXPECT_EQ(remarks(phyac, R"({"continuous":1,"logN":1})"),
+            "\"continuous\" has no effect: no property shows it, and no session uses it\n");
+}
+
+TEST_F(Reasons, TellWhyARecordIsRefused) {
+  const void* map = open(pdr);
+  set(map, R"({"N":6})");
+  EXPECT_EQ(judged(map, valued(0, 1)), "refused: ends before its number of items");
+  EXPECT_EQ(judged(map, valued(-1, 2)), "refused: says that it has -1 items");
+  Bytes many = valued(40, 2);
+  many.resize(10 + 39 * 28);
+  EXPECT_EQ(judged(map, many), "refused: says that it has 40 items, and has room for 39");
+  many.resize(10 + 40 * 28);
+  EXPECT_EQ(judged(map, many), "batch filling: 40 of 64 items");
+  EXPECT_EQ(judged(map, many), "refused: with it, 80 items would be gathered, where 64 have room");
+
+  const void* nav = open(phyac);
+  set(nav, "{}");
+  EXPECT_EQ(judged(nav, valued(0, 1)), "refused: ends before its number of items");
+  EXPECT_EQ(judged(nav, valued(3, 5)), "refused: says that it has 3 items, and has room for 1");
+
+  const void* letters = open(gspx);
+  EXPECT_EQ(judged(letters, valued(0, 2)), "refused: has 10 bytes, where 24 to 2052 are taken");
+  EXPECT_EQ(judged(letters, valued(0x7fff0000, 16)),
+            "refused: says that its samples have 32767 bytes, and has room for 12");
+  EXPECT_EQ(judged(nullptr, {}), "refused: its session is not open");
+}
+
+TEST_F(Reasons, TellWhatThePlatformDoesNotDo) {
+  const char handle = 0;
+  model.answers.starts = false;
+  EXPECT_EQ(model.open("GSPX", &handle).why.remarks,
+            (std::vector{Remark{"the platform's gesture engine does not start: no gesture may be recognised",
+                                "hmm gesture algorithm start return false"}}));
+  const std::string cause = "the platform's audio session cannot be switched ";
+  const auto told = [&] { return model.open("LPE_P", &handle).why.remarks.at(0); };
+  model.answers.get = -1;
+  EXPECT_EQ(told().text, cause + "on: no module is loaded");
+  model.answers = {};
+  model.answers.open = -2;
+  EXPECT_EQ(told(), (Remark{cause + "on: the module opens no device", "device open result -2\n"}));
+  model.answers = {};
+  model.answers.activate = -1;
+  EXPECT_EQ(told(), (Remark{cause + "on: the device refuses", "activated aware failed\n"}));
+  model.answers = {};
+  model.answers.deactivate = -1;
+  const void* music = open(lpe);
+  EXPECT_EQ(model.close(music, true).why.remarks.at(0).text, cause + "off: the device refuses");
 }
 
 TEST_F(Reasons, TellHowManyItemsANegotiationCutsOff) {

@@ -10,7 +10,7 @@ _senseloom() {
   local -A options=(
     [senseloom]="--help --version"
     [replay]="--help --json --quiet --all --check --log --plot --class-names"
-    [explain]="--help --records --plot --class-names"
+    [explain]="--help --records --all --problems --json --plot --class-names"
     [record]="--help --output --force --max-size --follow-forks --attach"
     [status]="--help"
     [generate]="--help"

@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cstdio>
 #include <fstream>
 #include <string>
@@ -49,31 +50,32 @@ TEST(ExplainTrace, CountsSessionsThatStayOpenButNegotiatesNoMore) {
 {"call":"set_option","session":"b","option":{"logN":1}}
 {"call":"dispatch","sensor":"PHYAC","record":{"timestamp":1,"items":[{"class":1,"seq":0}]}}
 )");
-  EXPECT_EQ(run.out,
-            "line 3: b on PHYAC sets {\"logN\":1}\n"
-            "  key               merged to                       a           b           merged  property     decided "
-            "by\n"
-            "  mode              1 when all are 1                0 default   0 default   0       41 = 0       all\n"
-            "  logN              minimum                         0 default   1           0                    a\n"
-            "  logM              minimum                         0 default   0 default   0                    all\n"
-            "  classMask         bitwise or                      -1 default  -1 default  -1      42 = -1      all\n"
-            "  summary           the one that started the merge  1 default   1 default   1                    b\n"
-            "  weightVar         the one that started the merge  -1 default  -1 default  -1                   b\n"
-            "  continuous        1 when any is not 0             0 default   0 default   0                    all\n"
-            "  spans                                                                             43 = 131073\n"
-            "  decisionsPerSpan                                                                  44 = 1\n"
-            "  chain of a: batches of 1, voted (all weigh the same), all classes\n"
-            "  chain of b: batches of 2, voted (all weigh the same), all classes\n"
-            "\n"
-            "b on PHYAC is open at the end\n"
-            "  items lost when a negotiation cut their batch off: 1\n"
-            "\n"
-            "what became of the records\n"
-            "  session  sensor  records  delivered  batch filling\n"
-            "  a        PHYAC         1          1              0\n"
-            "  b        PHYAC         1          0              1\n"
-            "  last chain of a: batches of 1, voted (all weigh the same), all classes\n"
-            "  last chain of b: batches of 2, voted (all weigh the same), all classes\n");
+  EXPECT_EQ(
+      run.out,
+      "line 3: b on PHYAC sets {\"logN\":1}\n"
+      "  key               merged to                       a           b           merged  property            "
+      "decided by\n"
+      "  mode              1 when all are 1                0 default   0 default   0       41 = 0              all\n"
+      "  logN              minimum                         0 default   1           0                           a\n"
+      "  logM              minimum                         0 default   0 default   0                           all\n"
+      "  classMask         bitwise or                      -1 default  -1 default  -1      42 = -1             all\n"
+      "  summary           the one that started the merge  1 default   1 default   1                           b\n"
+      "  weightVar         the one that started the merge  -1 default  -1 default  -1                          b\n"
+      "  continuous        1 when any is not 0             0 default   0 default   0                           all\n"
+      "  spans                                                                             43 = 131073 (2, 1)\n"
+      "  decisionsPerSpan                                                                  44 = 1\n"
+      "  chain of a: batches of 1 = 2^(logN 0 - merged logM 0), voted (all weigh the same), all classes\n"
+      "  chain of b: batches of 2 = 2^(logN 1 - merged logM 0), voted (all weigh the same), all classes\n"
+      "\n"
+      "b on PHYAC is open at the end\n"
+      "  items lost when a negotiation cut their batch off: 1\n"
+      "\n"
+      "what became of the records\n"
+      "  session  sensor  records  delivered  batch filling\n"
+      "  a        PHYAC         1          1              0\n"
+      "  b        PHYAC         1          0              1\n"
+      "  last chain of a: batches of 1 = 2^(logN 0 - merged logM 0), voted (all weigh the same), all classes\n"
+      "  last chain of b: batches of 2 = 2^(logN 1 - merged logM 0), voted (all weigh the same), all classes\n");
 }
 
 TEST(ExplainTrace, KnowsThatSessionsFromBeforeAnUninitNegotiateWithNobody) {
@@ -118,10 +120,14 @@ TEST(ExplainTrace, ExplainsASessionThatDoesNotOpen) {
 {"call":"close","session":"a"}
 )",
                               {{"SENSELOOM_AWARE_FAIL_ACTIVATE", "1"}});
-  EXPECT_EQ(run.out.rfind("line 1: a on LPE_P does not open\n", 0), 0U) << run.out;
-  EXPECT_NE(run.out.find("  logged: aware_audio: activated aware failed\n"), std::string::npos) << run.out;
+  EXPECT_EQ(run.out.rfind("line 1: a on LPE_P does not open\n"
+                          "  the platform's audio session cannot be switched on: the device refuses\n"
+                          "    logged: activated aware failed\n",
+                          0),
+            0U)
+      << run.out;
   EXPECT_NE(run.out.find("line 2: a on LPE_P sets {}\n  refused: the session did not open\n"
-                         "line 3: a on LPE_P refused\n"),
+                         "line 3: a on LPE_P refused: its session is not open\n"),
             std::string::npos)
       << run.out;
   EXPECT_EQ(run.status, 0);
@@ -153,6 +159,124 @@ TEST(ExplainTrace, TakesNoMoreMemoryForALongTraceThanForAShortOne) {
   EXPECT_EQ(shortRun.status, 0);
   EXPECT_EQ(longRun.status, 0);
   EXPECT_LT(longRun.peakKilobytes, shortRun.peakKilobytes + 4096);
+}
+
+constexpr char kTroubled[] = R"({"call":"open","session":"a","sensor":"STAP"}
+{"call":"set_option","session":"a","option":{"level":1}}
+{"call":"set_option","session":"a","option":{"levle":1}}
+{"call":"dispatch","session":"a","record":{"timestamp":1,"classes":1}}
+{"call":"dispatch","session":"a","record":{"hex":"0000"}}
+{"call":"open","session":"map","sensor":"PDR"}
+{"call":"dispatch","session":"map","record":{"hex":"0000"}}
+{"call":"close","session":"a"}
+)";
+
+TEST(ExplainProblems, AreAllThatIsPrintedWhenAsked) {
+  const ToolRun run = runTool({"explain", "--problems", "-"}, kTroubled);
+  EXPECT_EQ(run.out,
+            "line 3: a on STAP sets {\"levle\":1}\n"
+            "  unknown key \"levle\" has no effect: the nearest known key is \"level\"\n"
+            "line 5: a on STAP too short: ends before its class or count\n"
+            "line 7: map on PDR refused: ends before its number of items\n");
+  EXPECT_EQ(run.status, 0);
+}
+
+TEST(ExplainProblems, AreNoneInATraceWithoutAny) {
+  EXPECT_EQ(runTool({"explain", "--problems", "STAP", "{}"}).out, "");
+  EXPECT_EQ(runTool({"explain", "--problems", "--records", "lift.jsonl"}).status, 2);
+}
+
+TEST(ExplainJson, TellsOfCallsRecordsAndSessions) {
+  const ToolRun run = runTool({"explain", "--json", "--records", "-"}, kTroubled);
+  const std::string negotiation = R"("negotiation":{"sessions":1,"keys":[)"
+                                  R"({"key":"classMask","rule":"bitwise or","requests":[)"
+                                  R"({"session":"a","value":3,"asked":3,"isDefault":true}],"merged":3,"before":)";
+  EXPECT_EQ(
+      run.out.substr(0, run.out.find('\n') + 1),
+      R"({"line":2,"call":"set_option","session":"a","sensor":"STAP","option":"{\"level\":1}","told":[],)" +
+          negotiation +
+          R"(null,"decidedBy":["a"]},{"key":"level","rule":"minimum","requests":[)"
+          R"({"session":"a","value":1,"asked":1,"isDefault":false}],"merged":1,"before":null,"decidedBy":["a"]}],)"
+          R"("properties":[{"id":101,"name":"classMask","text":"3"},{"id":102,"name":"level","text":"1"}],)"
+          R"("chains":[]}})"
+          "\n");
+  EXPECT_NE(run.out.find(R"("told":[{"about":"remark","text":"unknown key \"levle\" has no effect: )"
+                         R"(the nearest known key is \"level\"","logged":null}],)" +
+                         negotiation + "3,"),
+            std::string::npos)
+      << run.out;
+  EXPECT_NE(run.out.find(R"({"line":7,"call":"dispatch","session":"map","sensor":"PDR","fate":"refused",)"
+                         R"("why":"refused: ends before its number of items","unexplained":null})"
+                         "\n"),
+            std::string::npos)
+      << run.out;
+  EXPECT_NE(run.out.find(R"({"account":"a","sensor":"STAP","records":2,"fates":{"delivered":1,"too short":1},)"
+                         R"("unexplained":0,"chain":null})"
+                         "\n"),
+            std::string::npos)
+      << run.out;
+  EXPECT_EQ(runTool({"explain", "--json", "--problems", "-"}, kTroubled).out.find(R"("line":2)"), std::string::npos);
+}
+
+TEST(ExplainJson, ShowsBytesThatAreNoTextAsNumbers) {
+  EXPECT_NE(runTool({"explain", "--json", "-"}, R"({"call":"open","session":"a","sensor":"GSFLK"}
+{"call":"set_option","session":"a","optionHex":"7bff"}
+)")
+                .out.find(R"("option":"{\\xff")"),
+            std::string::npos);
+}
+
+// Opens and asks for `sessions`, sends each a record, and closes them.
+std::string crowd(int sessions, int levels) {
+  std::string trace;
+  for (int i = 0; i < sessions; ++i) {
+    const std::string name = "s" + std::to_string(i);
+    trace += R"({"call":"open","session":")" + name + R"(","sensor":"STAP"})" + "\n" +
+             R"({"call":"set_option","session":")" + name + R"(","option":{"level":)" + std::to_string(5 - i % levels) +
+             "}}\n";
+  }
+  trace += R"({"call":"dispatch","sensor":"STAP","record":{"timestamp":1,"classes":1}})"
+           "\n";
+  for (int i = 0; i < sessions; ++i) trace += R"({"call":"close","session":"s)" + std::to_string(i) + "\"}\n";
+  return trace;
+}
+
+TEST(ExplainManySessions, TakesAPage) {
+  const ToolRun alike = runTool({"explain", "-"}, crowd(300, 1));
+  EXPECT_LT(std::count(alike.out.begin(), alike.out.end(), '\n'), 60) << alike.out;
+  EXPECT_NE(alike.out.find("  s0, s1, s2, s3 and 296 more  STAP          1          1\n"), std::string::npos)
+      << alike.out;
+  const ToolRun unlike = runTool({"explain", "-"}, crowd(300, 7));
+  EXPECT_LT(std::count(unlike.out.begin(), unlike.out.end(), '\n'), 150) << unlike.out;
+}
+
+TEST(ExplainManySessions, ShowsWhatDiffers) {
+  const std::string out = runTool({"explain", "-"}, crowd(9, 6)).out;
+  EXPECT_NE(
+      out.find("line 12: s5 on STAP sets {\"level\":0}\n"
+               "  session     level\n"
+               "  s5          0\n"
+               "  5 more      ...\n"
+               "  merged to   minimum\n"
+               "  merged      0\n"
+               "  before      1\n"
+               "  property    102 = 0\n"
+               "  decided by  s5\n"
+               "\n"
+               "lines 14 to 23: 7 more calls, after which everything is merged to what it was (--all shows them)\n"),
+      std::string::npos)
+      << out;
+}
+
+TEST(ExplainManySessions, ShowsAllWhenAsked) {
+  const std::string out = runTool({"explain", "--all", "-"}, crowd(6, 6)).out;
+  EXPECT_NE(out.find("line 12: s5 on STAP sets {\"level\":0}\n"
+                     "  session     classMask   level\n"
+                     "  s0          3 default   5\n"),
+            std::string::npos)
+      << out;
+  EXPECT_NE(out.find("line 14: s0 on STAP leaves\n"), std::string::npos) << out;
+  EXPECT_EQ(out.find("more"), std::string::npos) << out;
 }
 
 TEST(ExplainOptions, OpensASessionAnOption) {

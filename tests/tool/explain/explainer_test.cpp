@@ -8,6 +8,7 @@
 #include <utility>
 #include <vector>
 
+#include "explain/explanation_text.h"
 #include "printed.h"
 
 namespace senseloom::tool {
@@ -16,7 +17,8 @@ namespace {
 // Tells an explainer of calls of session "a" on a sensor, as if a library had returned what the test says.
 class Explaining {
  public:
-  Explaining(std::FILE* out, const char* sensor) : layout(findSensor(sensor)), explainer(out, log, false) {}
+  Explaining(std::FILE* out, const char* sensor)
+      : layout(findSensor(sensor)), output(out, {}), explainer(output, log) {}
 
   void open(bool opens = true) {
     explainer.onOutcome({.call = callOf(CallKind::open), .session = name, .sensor = layout, .failed = !opens});
@@ -56,6 +58,7 @@ class Explaining {
   const std::string name = "a";
   const Sensor* layout;
   LogCapture log;
+  ExplanationText output;
   Explainer explainer;
 };
 
@@ -127,7 +130,7 @@ TEST(Explainer, SaysWhenAnExpectedLogLineIsMissing) {
     a.set(R"({"classMask":4,"level":1})", 0, {{property(101, 3), property(102, 1)}});
   });
   EXPECT_NE(text.find("  \"classMask\" 4 is not in 1..3: 3 is used\n"
-                      "    unexplained: the library did not log: tapping: invalid clsmask value 4\n"),
+                      "  unexplained: the library did not log: tapping: invalid clsmask value 4\n"),
             std::string::npos)
       << text;
 }
@@ -184,7 +187,10 @@ TEST(Explainer, SaysWhenASessionOpensOrNotWithoutAReason) {
               __android_log_print(ANDROID_LOG_ERROR, "aware_audio", "activated aware failed\n");
               a.open();
             }),
-            "line 7: a on LPE_P unexplained: opens, where no session was derived\n");
+            "line 7: a on LPE_P opens\n"
+            "  the platform's audio session cannot be switched on: the device refuses\n"
+            "    logged: activated aware failed\n"
+            "  unexplained: no session was derived\n");
 }
 
 TEST(Explainer, TakesALineThatThePlatformCutAsLogged) {

@@ -15,15 +15,15 @@ namespace {
 struct ExplainArguments {
   std::string subject;
   std::vector<std::string> options;
-  bool records = false;
+  ExplanationForm form;
   PlotArguments plot;
 };
 
 void explain(std::FILE* out, const ExplainArguments& arguments) {
   if (findSensor(arguments.subject) != nullptr || !arguments.options.empty()) {
-    explainOptions(out, arguments.subject, arguments.options);
+    explainOptions(out, arguments.subject, arguments.options, arguments.form);
   } else {
-    explainTrace(out, arguments.subject, arguments.records, arguments.plot);
+    explainTrace(out, arguments.subject, arguments.form, arguments.plot);
   }
 }
 
@@ -40,7 +40,16 @@ void declareExplain(CLI::App& app, Action& action) {
   command->add_option("TRACE", arguments->subject, "a trace (- is standard input), or the name of a sensor")
       ->required();
   auto* options = command->add_option("OPTION", arguments->options, "the option string of a session on the sensor");
-  command->add_flag("--records", arguments->records, "explain what became of each record, too")->excludes(options);
+  ExplanationExtent& extent = arguments->form.extent;
+  auto* records = command->add_flag("--records", extent.records, "explain what became of each record, too");
+  records->excludes(options);
+  auto* all = command->add_flag("--all", extent.all, "of many sessions, print all, and not only what differs");
+  command
+      ->add_flag("--problems", extent.problems,
+                 "print nothing but what was rejected, refused or lost, and what is unexplained")
+      ->excludes(records)
+      ->excludes(all);
+  command->add_flag("--json", arguments->form.json, "print one JSON object per call");
   addPlotOptions(*command, arguments->plot)->excludes(options);
   command->callback([arguments, options, &action] {
     arguments->options = options->reduced_results();

@@ -5,6 +5,8 @@
 #include <utility>
 
 #include "explain/explainer.h"
+#include "explain/explanation_json.h"
+#include "explain/explanation_text.h"
 #include "explain/log_capture.h"
 #include "input_error.h"
 #include "plot/replay_plot.h"
@@ -29,17 +31,24 @@ TraceReader openTrace(const std::string& file) try { return TraceReader(file); }
   throw InputError(std::string(error.what()) + ", and no sensor has that name");
 }
 
+std::unique_ptr<ExplanationOutput> makeOutput(std::FILE* out, const ExplanationForm& form) {
+  if (form.json) return std::make_unique<ExplanationJson>(out, form.extent);
+  return std::make_unique<ExplanationText>(out, form.extent);
+}
+
 std::string sessionName(size_t index) {
   return "session " + std::to_string(index + 1);
 }
 
 }  // namespace
 
-void explainOptions(std::FILE* out, const std::string& sensor, const std::vector<std::string>& options) {
+void explainOptions(std::FILE* out, const std::string& sensor, const std::vector<std::string>& options,
+                    const ExplanationForm& form) {
   const Sensor* layout = &sensorNamed(sensor);
   if (options.empty()) throw InputError("no option string for a session on " + sensor);
   LogCapture log;
-  Explainer explainer(out, log, false);
+  const auto output = makeOutput(out, form);
+  Explainer explainer(*output, log);
   Replayer replayer(explainer);
   for (size_t i = 0; i < options.size(); ++i) {
     TraceCall call;
@@ -54,13 +63,14 @@ void explainOptions(std::FILE* out, const std::string& sensor, const std::vector
   for (size_t i = 0; i < options.size(); ++i) requireObject(sessionName(i), options[i]);
 }
 
-void explainTrace(std::FILE* out, const std::string& file, bool withRecords, const PlotArguments& plot) {
+void explainTrace(std::FILE* out, const std::string& file, const ExplanationForm& form, const PlotArguments& plot) {
   const InterruptMark mark;
   TraceReader trace = openTrace(file);
   LogCapture log;
-  auto explainer = std::make_unique<Explainer>(out, log, withRecords);
-  const auto output = withProgress(withPlot(std::move(explainer), file, plot), trace, out, true);
-  Replayer(*output).replay(trace);
+  const auto output = makeOutput(out, form);
+  auto explainer = std::make_unique<Explainer>(*output, log);
+  const auto observer = withProgress(withPlot(std::move(explainer), file, plot), trace, out, !form.extent.problems);
+  Replayer(*observer).replay(trace);
 }
 
 }  // namespace senseloom::tool

@@ -4,8 +4,8 @@
 #include <string_view>
 #include <utility>
 
-#include "explain/negotiation_output.h"
 #include "explain/platform_answers.h"
+#include "trace/property_text.h"
 
 namespace senseloom::tool {
 namespace {
@@ -21,6 +21,37 @@ bool isDelivered(const CallOutcome& outcome, const model::Outcome& expected) {
   const std::span<const uint8_t> wanted =
       expected.delivers == model::Outcome::sameRecord ? outcome.record : std::span<const uint8_t>(expected.result);
   return outcome.result && std::equal(wanted.begin(), wanted.end(), outcome.result->begin(), outcome.result->end());
+}
+
+std::string withoutLineFeed(const std::string& line) {
+  return line.substr(0, line.find_last_not_of('\n') + 1);
+}
+
+// Compares the two lists entry by entry.
+void tellDifferences(const std::optional<model::PropertyList>& expected, const std::optional<PropertyList>& returned,
+                     std::vector<Told>& told) {
+  if (expected.has_value() != returned.has_value()) {
+    told.push_back(
+        {Told::unexplained, std::string("the library returned ") + (returned ? "a" : "no") + " property list"});
+  }
+  if (!expected || !returned) return;
+  PropertyList derived;
+  for (const model::Property& entry : *expected)
+    derived.push_back({entry.id, {entry.value.begin(), entry.value.end()}});
+  for (size_t i = 0; i < std::max(derived.size(), returned->size()); ++i) {
+    const auto text = [i](const PropertyList& list) {
+      return i < list.size() ? std::to_string(list[i].id) + " = " + valueText(list[i]) : std::string("nothing");
+    };
+    const bool hasBoth = i < derived.size() && i < returned->size();
+    if (hasBoth && derived[i].id == (*returned)[i].id && derived[i].value == (*returned)[i].value) continue;
+    told.push_back({Told::unexplained, "property " + text(*returned) + ", where " + text(derived) + " was derived"});
+  }
+}
+
+void tellCounts(const model::ItemCounts& counts, std::vector<Told>& told) {
+  for (const model::ItemCount& count : counts.told()) {
+    told.push_back({count.isLoss ? Told::loss : Told::note, count.text});
+  }
 }
 
 }  // namespace
@@ -44,50 +75,53 @@ void Explainer::onOutcome(const CallOutcome& outcome) {
       break;
     case CallKind::uninit:
       model.uninit();
+      merged.clear();
       break;
   }
-}
-
-void Explainer::onEnd() {
-  printAccounts(out, accounts);
 }
 
 void Explainer::open(const CallOutcome& outcome) {
   Account& account = accountOf(outcome.session, outcome.sensor);
   const Session& session = sessions.emplace_back(Session{outcome.session, outcome.sensor});
-  const bool isExpected = model.open(outcome.sensor->name, &session).returned == 1;
-  if (!outcome.failed) {
+  const model::Outcome expected = model.open(outcome.sensor->name, &session);
+  const bool isExpected = expected.returned == 1;
+  ExplainedCall call{.outcome = outcome, .what = outcome.failed ? "does not open" : "opens", .told = {}};
+  tell(expected.why.remarks, outcome.failed ? Told::refusal : Told::remark, call.told);
+  if (isExpected == outcome.failed) {
+    call.told.push_back({Told::unexplained, outcome.failed ? "the library opened no session, where one was derived"
+                                                           : "no session was derived"});
+  }
+  if (outcome.failed) {
+    if (isExpected) model.close(&session, true);
+    sessions.pop_back();
+    tellRestOfLog(call.told);
+  } else {
     account.chain = model.chain(&session);
-    if (!isExpected) printBlock(outcome, "unexplained: opens, where no session was derived");
-    return;
   }
-  printBlock(outcome, "does not open");
-  if (isExpected) {
-    std::fputs("  unexplained: the library opened no session, where one was derived\n", out);
-    model.close(&session, true);
-  }
-  sessions.pop_back();
-  printRestOfLog();
+  if (!call.told.empty()) output.onCall(call);
 }
 
 void Explainer::setOption(const CallOutcome& outcome) {
   const auto session = find(outcome.session);
   const auto& text = outcome.call.option;
-  printBlock(outcome, "sets " + text.value_or("a null pointer"));
+  ExplainedCall call{.outcome = outcome, .what = "sets " + text.value_or("a null pointer"), .told = {}};
   if (session == sessions.end()) {
-    std::fputs("  refused: the session did not open\n", out);
+    call.told.push_back({Told::refusal, "refused: the session did not open"});
+    output.onCall(call);
     return;
   }
   const model::Outcome expected = model.setOption(&*session, text ? text->c_str() : nullptr, true);
-  printRemarks(expected.why.remarks);
+  tell(expected.why.remarks, Told::remark, call.told);
   if (expected.why.negotiation) {
-    noteRestarts(*expected.why.negotiation, false);
-    printNegotiation(outcome, expected);
-  } else {
-    checkReturn(outcome, expected);
-    if (outcome.failed) std::fputs("  refused: nothing changes\n", out);
+    call.negotiation = explained(outcome, *expected.why.negotiation, &*session);
+    noteRestarts(*expected.why.negotiation, false, call.negotiation->restarted);
+  } else if (outcome.failed) {
+    call.toldAfter.push_back({Told::refusal, "refused: nothing changes"});
   }
-  printRestOfLog();
+  tellResult(expected, call);
+  tellRestOfLog(call.toldAfter);
+  output.onCall(call);
+  if (expected.why.negotiation) merged[outcome.sensor] = expected.why.negotiation->keys;
 }
 
 void Explainer::dispatch(const CallOutcome& outcome) {
@@ -99,88 +133,95 @@ void Explainer::dispatch(const CallOutcome& outcome) {
                               static_cast<int>(outcome.record.size()), true, true);
     session->items += expected.why.items;
   }
-  const model::Verdict& verdict = expected.why.verdict;
+  ExplainedRecord record{.outcome = outcome, .verdict = expected.why.verdict};
+  if (record.verdict.returned() != outcome.returned) {
+    record.unexplained = "the library returned " + std::to_string(outcome.returned) +
+                         ", where this was derived: " + record.verdict.text();
+  } else if (!isDelivered(outcome, expected)) {
+    record.unexplained = "the library delivered other bytes than were derived";
+  }
   Account& account = accountOf(outcome.session, outcome.sensor);
-  if (verdict.returned() != outcome.returned) {
-    ++account.unexplained;
-    printLine(outcome, "unexplained: the library returned " + std::to_string(outcome.returned) +
-                           ", where this was derived: " + verdict.text());
-    return;
-  }
-  if (!isDelivered(outcome, expected)) {
-    ++account.unexplained;
-    printLine(outcome, "unexplained: the library delivered other bytes than were derived");
-    return;
-  }
-  ++account.fates[static_cast<size_t>(verdict.fate)];
-  if (records) printLine(outcome, verdict.text());
+  ++(record.unexplained.empty() ? account.fates[static_cast<size_t>(record.verdict.fate)] : account.unexplained);
+  output.onRecord(record);
 }
 
 void Explainer::close(const CallOutcome& outcome) {
   const auto closing = find(outcome.session);
   // At the end of the trace sessions are closed by the tool, which is no news but for what they made of the records.
   const bool isAtEnd = outcome.call.line == 0;
+  ExplainedCall call{.outcome = outcome, .what = isAtEnd ? "is open at the end" : "leaves", .told = {}};
   if (closing == sessions.end()) {
-    if (!isAtEnd) printBlock(outcome, "leaves");
+    if (!isAtEnd) output.onCall(call);
     return;
   }
   const model::Outcome expected = model.close(&*closing, true);
   closing->items += expected.why.items;
-  const std::string account = closing->items.text();
+  tellCounts(closing->items, call.told);
+  tell(expected.why.remarks, Told::refusal, call.told);
   sessions.erase(closing);
-  if (!isAtEnd || !account.empty() || outcome.returned != expected.returned) {
-    printBlock(outcome, isAtEnd ? "is open at the end" : "leaves");
+  const auto& negotiation = expected.why.negotiation;
+  std::vector<size_t> restarted;
+  if (negotiation) noteRestarts(*negotiation, isAtEnd, restarted);
+  if (negotiation && !isAtEnd) {
+    call.negotiation = explained(outcome, *negotiation, nullptr);
+    call.negotiation->restarted = std::move(restarted);
   }
-  if (!account.empty()) std::fprintf(out, "  %s\n", account.c_str());
-  if (expected.why.negotiation) noteRestarts(*expected.why.negotiation, isAtEnd);
-  if (expected.why.negotiation && !isAtEnd) {
-    printNegotiation(outcome, expected);
-  } else {
-    checkReturn(outcome, expected);
-  }
-  if (!isAtEnd) printRestOfLog();
+  tellResult(expected, call);
+  if (!isAtEnd) tellRestOfLog(call.toldAfter);
+  if (!isAtEnd || !call.told.empty() || !call.toldAfter.empty()) output.onCall(call);
+  if (negotiation) merged[outcome.sensor] = negotiation->keys;
 }
 
-void Explainer::printNegotiation(const CallOutcome& outcome, const model::Outcome& expected) {
-  const model::Negotiation& negotiation = *expected.why.negotiation;
-  std::vector<std::string> names;
+ExplainedNegotiation Explainer::explained(const CallOutcome& outcome, const model::Negotiation& negotiation,
+                                          const void* caller) {
+  ExplainedNegotiation told{.derived = &negotiation,
+                            .names = {},
+                            .caller = 0,
+                            .before = nullptr,
+                            .properties = &outcome.properties,
+                            .restarted = {}};
   for (const auto& participant : negotiation.participants) {
-    names.push_back(static_cast<const Session*>(participant.handle)->name);
+    if (participant.handle == caller) told.caller = told.names.size();
+    told.names.push_back(static_cast<const Session*>(participant.handle)->name);
   }
-  tool::printNegotiation(out, negotiation, names, expected.list, outcome.properties);
-  if (negotiation.conflict) printRemarks({*negotiation.conflict});
-  checkReturn(outcome, expected);
-  for (size_t i = 0; i < names.size(); ++i) {
-    const std::string& chain = negotiation.participants[i].chain;
-    if (!chain.empty()) std::fprintf(out, "  chain of %s: %s\n", names[i].c_str(), chain.c_str());
+  if (caller == nullptr) told.caller = told.names.size();
+  const auto before = merged.find(outcome.sensor);
+  if (before != merged.end()) told.before = &before->second;
+  return told;
+}
+
+void Explainer::noteRestarts(const model::Negotiation& negotiation, bool isAtEnd, std::vector<size_t>& restarted) {
+  for (size_t i = 0; i < negotiation.participants.size(); ++i) {
+    const model::Participant& participant = negotiation.participants[i];
+    if (participant.chain.empty()) continue;
+    const auto session =
+        std::find_if(sessions.begin(), sessions.end(), [&](const Session& one) { return &one == participant.handle; });
+    session->items.cutOff += participant.cutOff;
+    if (isAtEnd) continue;
+    std::string& chain = accountOf(session->name, session->sensor).chain;
+    if (chain != participant.chain) restarted.push_back(i);
+    chain = participant.chain;
   }
 }
 
-void Explainer::noteRestarts(const model::Negotiation& negotiation, bool isAtEnd) {
-  for (Session& session : sessions) {
-    const auto restarted = std::find_if(negotiation.participants.begin(), negotiation.participants.end(),
-                                        [&session](auto& participant) { return participant.handle == &session; });
-    if (restarted == negotiation.participants.end() || restarted->chain.empty()) continue;
-    session.items.cutOff += restarted->cutOff;
-    if (!isAtEnd) accountOf(session.name, session.sensor).chain = restarted->chain;
+void Explainer::tellResult(const model::Outcome& expected, ExplainedCall& call) {
+  if (call.negotiation) {
+    tellDifferences(expected.list, call.outcome.properties, call.toldAfter);
+    const auto& conflict = expected.why.negotiation->conflict;
+    if (conflict) tell({*conflict}, Told::refusal, call.toldAfter);
   }
+  const int returned = call.outcome.returned;
+  if (returned == expected.returned) return;
+  call.toldAfter.push_back({Told::unexplained, "the library returned " + std::to_string(returned) + ", where " +
+                                                   std::to_string(expected.returned) + " was derived"});
 }
 
-void Explainer::checkReturn(const CallOutcome& outcome, const model::Outcome& expected) {
-  if (outcome.returned == expected.returned) return;
-  std::fprintf(out, "  unexplained: the library returned %d, where %d was derived\n", outcome.returned,
-               expected.returned);
-}
-
-void Explainer::printRemarks(const std::vector<model::Remark>& remarks) {
+void Explainer::tell(const std::vector<model::Remark>& remarks, Told::About about, std::vector<Told>& told) {
   for (const model::Remark& remark : remarks) {
-    std::fprintf(out, "  %s\n", remark.text.c_str());
-    if (remark.logged.empty()) continue;
-    if (takeLogged(remark.logged)) {
-      std::fprintf(out, "    logged: %s\n", remark.logged.c_str());
-    } else {
-      std::fprintf(out, "    unexplained: the library did not log: %s\n", remark.logged.c_str());
-    }
+    const bool isLogged = !remark.logged.empty() && takeLogged(remark.logged);
+    told.push_back({about, remark.text, isLogged ? withoutLineFeed(remark.logged) : ""});
+    if (isLogged || remark.logged.empty()) continue;
+    told.push_back({Told::unexplained, "the library did not log: " + withoutLineFeed(remark.logged)});
   }
 }
 
@@ -193,22 +234,8 @@ bool Explainer::takeLogged(const std::string& text) {
   return true;
 }
 
-void Explainer::printRestOfLog() {
-  for (const model::LogLine& line : log) {
-    const size_t end = line.text.find_last_not_of('\n');
-    std::fprintf(out, "  logged: %s: %s\n", line.tag.c_str(), line.text.substr(0, end + 1).c_str());
-  }
-}
-
-void Explainer::printBlock(const CallOutcome& outcome, const std::string& what) {
-  if (begun) std::fputc('\n', out);
-  printLine(outcome, what);
-}
-
-void Explainer::printLine(const CallOutcome& outcome, const std::string& what) {
-  begun = true;
-  if (outcome.call.line != 0) std::fprintf(out, "line %zu: ", outcome.call.line);
-  std::fprintf(out, "%s on %s %s\n", outcome.session.c_str(), outcome.sensor->name, what.c_str());
+void Explainer::tellRestOfLog(std::vector<Told>& told) {
+  for (const model::LogLine& line : log) told.push_back({Told::logged, line.tag + ": " + withoutLineFeed(line.text)});
 }
 
 Account& Explainer::accountOf(const std::string& session, const Sensor* sensor) {

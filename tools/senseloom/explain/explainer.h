@@ -1,29 +1,28 @@
 #pragma once
 
-#include <cstdio>
 #include <list>
+#include <map>
 #include <string>
 #include <vector>
 
-#include "explain/account_output.h"
+#include "explain/explanation.h"
 #include "explain/log_capture.h"
 #include "model/model.h"
 #include "trace/replayer.h"
 
 namespace senseloom::tool {
 
-// Prints why: for each negotiation what every session asked for, what was rejected, and who decided; for each session
-// what became of its records. The reasons are those of the model, which is given the same calls. Where the library did
-// something else, it says so: "unexplained".
+// Finds out why: for each negotiation what every session asked for, what was rejected, and who decided; for each
+// session what became of its records. The reasons are those of the model, which is given the same calls. Where the
+// library did something else, it says so: "unexplained".
 class Explainer final : public ReplayObserver {
  public:
-  // Prints what became of each record, too, if `withRecords` is set. `source` is where the library's log goes.
-  Explainer(std::FILE* stream, LogSource& source, bool withRecords)
-      : out(stream), library(source), records(withRecords) {
+  // `source` is where the library's log goes.
+  Explainer(ExplanationOutput& explanations, LogSource& source) : output(explanations), library(source) {
     model.explains = true;
   }
   void onOutcome(const CallOutcome& outcome) override;
-  void onEnd() override;
+  void onEnd() override { output.onEnd(accounts); }
 
  private:
   // Its address is its handle in the model.
@@ -39,30 +38,27 @@ class Explainer final : public ReplayObserver {
   void dispatch(const CallOutcome& outcome);
   void close(const CallOutcome& outcome);
 
-  void printNegotiation(const CallOutcome& outcome, const model::Outcome& expected);
+  // What is to be told of a negotiation, but for what it does to the sessions.
+  ExplainedNegotiation explained(const CallOutcome& outcome, const model::Negotiation& negotiation, const void* caller);
   // Notes what a negotiation makes of the sessions that start over. What they go on with at the end of the trace, while
   // it is the tool that closes one after the other, is no news.
-  void noteRestarts(const model::Negotiation& negotiation, bool isAtEnd);
-  void checkReturn(const CallOutcome& outcome, const model::Outcome& expected);
-  // Prints what is told of an option, each with what the library logged about it.
-  void printRemarks(const std::vector<model::Remark>& remarks);
+  void noteRestarts(const model::Negotiation& negotiation, bool isAtEnd, std::vector<size_t>& restarted);
+  void tellResult(const model::Outcome& expected, ExplainedCall& call);
+  // What the model says, each with what the library logged about it.
+  void tell(const std::vector<model::Remark>& remarks, Told::About about, std::vector<Told>& told);
+  void tellRestOfLog(std::vector<Told>& told);
   // The log line of that text, for which it is taken as explained; false when there is none.
   bool takeLogged(const std::string& text);
-  void printRestOfLog();
-  // A block of several lines, apart from what is before it.
-  void printBlock(const CallOutcome& outcome, const std::string& what);
-  void printLine(const CallOutcome& outcome, const std::string& what);
   Account& accountOf(const std::string& session, const Sensor* sensor);
   SessionIterator find(const std::string& name);
 
-  std::FILE* out;
+  ExplanationOutput& output;
   LogSource& library;
-  bool records;
-  bool begun = false;           // something was printed
   model::Log log;               // of the call, but for what was explained
   model::Model model;           // what the library should do
   std::list<Session> sessions;  // those that are open, in opening order
   std::vector<Account> accounts;
+  std::map<const Sensor*, std::vector<model::MergedKey>> merged;  // as each sensor negotiated last
 };
 
 }  // namespace senseloom::tool

@@ -1,11 +1,10 @@
 #include "replay/table_output.h"
 
 #include <algorithm>
-#include <span>
 
 #include "kinds/option_data.h"
-#include "trace/hex.h"
 #include "trace/json.h"
+#include "trace/property_text.h"
 #include "trace/record_codec.h"
 
 namespace senseloom::tool {
@@ -18,20 +17,13 @@ std::string shortened(const std::string& digits) {
   return digits.size() <= 2 * kMostBytes ? digits : digits.substr(0, 2 * kMostBytes) + "...";
 }
 
-std::string bytesText(std::span<const uint8_t> bytes) {
-  if (bytes.empty()) return "no bytes";
-  const std::string text = shortened(toHex(bytes));
-  return bytes.size() <= kMostBytes ? text : text + " (" + std::to_string(bytes.size()) + " bytes)";
-}
-
 std::string propertiesText(const CallOutcome& outcome) {
   if (outcome.properties->empty()) return "no properties";
   std::string text;
   for (const Property& property : *outcome.properties) {
     if (!text.empty()) text += ", ";
-    text += std::to_string(property.id) + ' ' + propertyName(outcome.sensor->name, property.id) + '=';
-    const auto value = property.integer();
-    text += value ? std::to_string(*value) : bytesText(property.value);
+    text += std::to_string(property.id) + ' ' + propertyName(outcome.sensor->name, property.id) + '=' +
+            valueText(*outcome.sensor, property);
   }
   return text;
 }

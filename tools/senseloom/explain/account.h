@@ -2,12 +2,10 @@
 
 #include <array>
 #include <cstddef>
-#include <cstdio>
 #include <string>
-#include <vector>
 
+#include "kinds/sensor_table.h"
 #include "model/reasons.h"
-#include "trace/record_codec.h"
 
 namespace senseloom::tool {
 
@@ -21,9 +19,5 @@ struct Account {
 
   size_t records() const;
 };
-
-// Prints a table with a row an account, and a column for each fate that any record had; then the chains.
-// Nothing without records.
-void printAccounts(std::FILE* out, const std::vector<Account>& accounts);
 
 }  // namespace senseloom::tool
