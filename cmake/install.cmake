@@ -61,11 +61,16 @@ install(
 install(TARGETS senseloom_cli RUNTIME COMPONENT tool)
 install(TARGETS senseloom_recorder senseloom_audit LIBRARY DESTINATION ${platform_dir} COMPONENT recorder)
 install(FILES docs/man/senseloom.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1 COMPONENT tool)
-install(
-  FILES tools/senseloom/completion.bash
-  DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions
-  RENAME senseloom
-  COMPONENT tool)
+function(install_completion file folder name)
+  install(
+    FILES tools/senseloom/completion/${file}
+    DESTINATION ${CMAKE_INSTALL_DATADIR}/${folder}
+    RENAME ${name}
+    COMPONENT tool)
+endfunction()
+install_completion(senseloom.bash bash-completion/completions senseloom)
+install_completion(senseloom.zsh zsh/vendor-completions _senseloom)
+install_completion(senseloom.fish fish/vendor_completions.d senseloom.fish)
 # The pages and what they lead to, laid out as here.
 install(FILES README.md CHANGELOG.md CONTRIBUTING.md SECURITY.md TYPE DOC COMPONENT tool)
 install(

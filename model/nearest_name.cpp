@@ -2,9 +2,21 @@
 
 #include <algorithm>
 #include <numeric>
+#include <string>
 #include <utility>
 
 namespace senseloom::model {
+namespace {
+
+std::string inLowerCase(std::string_view name) {
+  std::string text(name);
+  for (char& c : text) {
+    if (c >= 'A' && c <= 'Z') c = static_cast<char>(c - 'A' + 'a');
+  }
+  return text;
+}
+
+}  // namespace
 
 size_t editDistance(std::string_view from, std::string_view to) {
   // One row of the table of distances: [j] is that of what was seen of `from` to the first j characters of `to`.
@@ -21,10 +33,11 @@ size_t editDistance(std::string_view from, std::string_view to) {
 }
 
 std::string_view nearestName(std::string_view name, const std::vector<std::string_view>& names) {
-  const auto nearest =
-      std::min_element(names.begin(), names.end(), [name](std::string_view left, std::string_view right) {
-        return editDistance(name, left) < editDistance(name, right);
-      });
+  const std::string wanted = inLowerCase(name);
+  const auto distance = [&wanted](std::string_view one) { return editDistance(wanted, inLowerCase(one)); };
+  const auto nearest = std::min_element(
+      names.begin(), names.end(),
+      [&distance](std::string_view left, std::string_view right) { return distance(left) < distance(right); });
   return nearest == names.end() ? std::string_view() : *nearest;
 }
 

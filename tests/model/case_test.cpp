@@ -83,7 +83,7 @@ TEST(CaseFile, RefusesLinesThatAreNotCalls) {
             "file:3: unknown sensor \"TAP\"");
   EXPECT_EQ(errorOfLine(R"({"call":"dispatch","session":"a","returned":0})"), "file:3: \"record\" must be an object");
   EXPECT_EQ(errorOfLine(R"({"call":"dispatch","session":"a","record":{"steps":1},"returned":0})"),
-            "file:3: unknown record field \"steps\"");
+            "file:3: unknown record field \"steps\"; the nearest is \"classes\"");
   EXPECT_EQ(errorOfLine(R"({"call":"set_option","session":"a","option":1,"returned":0})"),
             "file:3: \"option\" must be an object, a string or null");
   EXPECT_EQ(errorOfLine(R"({"call":"set_option","session":"a","optionHex":"1","returned":0})"),

@@ -20,6 +20,7 @@ TEST(NearestName, IsTheFirstOfThoseWithTheLeastDistance) {
   EXPECT_EQ(nearestName("log", {"mode", "logN", "logM"}), "logN");
   EXPECT_EQ(nearestName("weight", {"mode", "weightVar"}), "weightVar");
   EXPECT_EQ(nearestName("any", {}), "");
+  EXPECT_EQ(nearestName("stap", {"LIFT", "STAP"}), "STAP");
 }
 
 }  // namespace

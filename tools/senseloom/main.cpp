@@ -8,11 +8,15 @@
 #include <cstdio>
 #include <cstring>
 #include <exception>
+#include <memory>
 #include <stdexcept>
 #include <string>
 #include <vector>
 
 #include "command.h"
+#include "command_line/argument_error.h"
+#include "command_line/completion.h"
+#include "command_line/help_format.h"
 #include "convert/convert_command.h"
 #include "exit_status.h"
 #include "explain/explain_arguments.h"
@@ -87,7 +91,13 @@ int run(int argc, char** argv) {
   app.set_version_flag("--version", "senseloom " SENSELOOM_VERSION);
   app.require_subcommand(1);
   Action action;
+  app.formatter(std::make_shared<HelpFormat>());
+  app.failure_message(argumentError);
   for (Declare* declare : kCommands) declare(app, action);
+  if (argc > 1 && std::strcmp(argv[1], kComplete) == 0) {
+    printCompletion(stdout, app, std::vector<std::string>(argv + 2, argv + argc));
+    return 0;
+  }
   unmarkValues(app);
   try {
     app.parse(markedArguments(argc, argv));

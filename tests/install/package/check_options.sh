@@ -30,12 +30,12 @@ check() {
   options=$(sed -nE 's/^  (-[a-zA-Z],)?(--[a-z-]+).*/\2/p' <<<"$help" | sort)
   commands=$(sed -nE '/^Subcommands:/,/^$/s/^  ([a-z]+).*/\1/p' <<<"$help" | sort)
   known+=$options$'\n'
-  same "completion of the options of senseloom $*" "$options" "$(offered senseloom "$@" --)"
+  same "completion of the options of senseloom $*" "$options" "$(offered "$tool" "$@" --)"
   if [ -z "$commands" ]; then
     grep -q "^\.SS \"$*\b" <<<"$manual" || { echo "The manual has no heading for senseloom $*"; exit 1; }
     return
   fi
-  same "completion of the commands of senseloom $*" "$commands" "$(offered senseloom "$@" "")"
+  same "completion of the commands of senseloom $*" "$commands" "$(offered "$tool" "$@" "")"
   for command in $commands; do check "$@" "$command"; done
 }
 check

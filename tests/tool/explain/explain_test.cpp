@@ -333,8 +333,12 @@ TEST(ExplainErrors, AreBadInput) {
     EXPECT_EQ(run.err, "senseloom: " + message + "\n");
     EXPECT_EQ(run.status, 2) << testing::PrintToString(line);
   };
-  expectError({"explain", "STPA", "{}"}, "unknown sensor \"STPA\": `senseloom sensors` prints those that are known");
-  expectError({"explain", "STPA"}, "STPA: No such file or directory, and no sensor has that name");
+  expectError({"explain", "STPA", "{}"},
+              "unknown sensor \"STPA\": the nearest is \"STAP\"; `senseloom sensors` prints all");
+  expectError({"explain", "STPA"},
+              "STPA: No such file or directory, and no sensor has that name; the nearest is \"STAP\"");
+  expectError({"explain", "no-such-file.jsonl"},
+              "no-such-file.jsonl: No such file or directory, and no sensor has that name");
   expectError({"explain", "STAP"}, "no option string for a session on STAP");
   expectError({"explain", "STAP", "{}", "{\"level\":"},
               "the option of session 2 is no JSON: unexpected token near end of file");

@@ -50,7 +50,7 @@ TEST(ReplayErrors, RefusesALineThatIsNotJson) {
 TEST(ReplayErrors, RefusesALineThatIsNotACall) {
   expectError("[1]", "not a JSON object");
   expectError(R"({"call":"open","session":"b","sensor":"TAP"})",
-              "unknown sensor \"TAP\": `senseloom sensors` prints those that are known");
+              "unknown sensor \"TAP\": the nearest is \"STAP\"; `senseloom sensors` prints all");
 }
 
 TEST(ReplayErrors, RefusesSessionsThatAreNotOpen) {
@@ -74,7 +74,7 @@ TEST(ReplayErrors, RefusesTheNameOfAnOpenSessionForAnother) {
 
 TEST(ReplayErrors, RefusesRecordsThatAreNotOfTheirSensor) {
   expectError(R"({"call":"dispatch","session":"a","record":{"timestamp":1,"class":1}})",
-              "unknown record field \"class\"");
+              "unknown record field \"class\"; the nearest is \"classes\"");
   // Even if no session would get it.
   expectError(R"({"call":"dispatch","sensor":"LIFT","record":{}})", "missing record field \"timestamp\"");
 }
@@ -87,13 +87,14 @@ TEST(ReplayErrors, ClosesWhatTheTraceOpened) {
 stop
 )");
   EXPECT_EQ(run.err.rfind("deactivating aware session...\nsenseloom: standard input:5: not JSON: ", 0), 0U) << run.err;
-  EXPECT_EQ(run.out,
-            kHeading +
-                "     1  open        a         LPE_P   handle\n"
-                "     2  open        b         LPE_P   handle\n"
-                "     3  open        c         PHYAC   handle\n"
-                "     4  set_option  c         PHYAC   0       41 mode=0, 43 spans=65537 (1, 1), 44 decisionsPerSpan=1, "
-                "42 classMask=-1\n");
+  EXPECT_EQ(
+      run.out,
+      kHeading +
+          "     1  open        a         LPE_P   handle\n"
+          "     2  open        b         LPE_P   handle\n"
+          "     3  open        c         PHYAC   handle\n"
+          "     4  set_option  c         PHYAC   0       41 mode=0, 43 spans=65537 (1, 1), 44 decisionsPerSpan=1, "
+          "42 classMask=-1\n");
   EXPECT_EQ(run.status, 2);
 }
 

@@ -95,7 +95,7 @@ TEST(Sensors, PrintsJson) {
 
 TEST(Sensors, RefusesAnUnknownSensor) {
   const ToolRun run = runTool({"sensors", "stap"});
-  EXPECT_EQ(run.err, "senseloom: unknown sensor \"stap\": `senseloom sensors` prints those that are known\n");
+  EXPECT_EQ(run.err, "senseloom: unknown sensor \"stap\": the nearest is \"STAP\"; `senseloom sensors` prints all\n");
   EXPECT_EQ(run.out, "");
   EXPECT_EQ(run.status, 2);
 }

@@ -46,7 +46,7 @@ TEST(SweepErrors, SayWhichClientIsMissing) {
   EXPECT_EQ(errorOf(kTrace, {"--set", "logN=0"}),
             "senseloom: sweep needs --session NAME, or --sensor SENSOR for one more client\n");
   EXPECT_EQ(errorOf(kTrace, {"--sensor", "PHYSIC", "--set", "logN=0"}),
-            "senseloom: unknown sensor \"PHYSIC\": `senseloom sensors` prints those that are known\n");
+            "senseloom: unknown sensor \"PHYSIC\": the nearest is \"PHYAC\"; `senseloom sensors` prints all\n");
   EXPECT_EQ(errorOf(kTrace, {"--sensor", "PHYAC", "--option", "[]", "--set", "logN=0"}),
             "senseloom: the option [] is not a JSON object, so no key of it can be set\n");
 }

@@ -135,11 +135,14 @@ TEST(RecordCodec, RefusesWhatIsNotHex) {
 }
 
 TEST(RecordCodec, RefusesUnknownFields) {
-  EXPECT_EQ(errorOf("STAP", R"({"timestamp":1,"class":1})"), "unknown record field \"class\"");
-  EXPECT_EQ(errorOf("SCOUN", R"({"timestamp":1,"steps":1,"items":[]})"), "unknown record field \"items\"");
-  EXPECT_EQ(errorOf("STAP", R"({"hex":"","timestamp":1})"), "unknown record field \"timestamp\"");
+  EXPECT_EQ(errorOf("STAP", R"({"timestamp":1,"class":1})"),
+            "unknown record field \"class\"; the nearest is \"classes\"");
+  EXPECT_EQ(errorOf("SCOUN", R"({"timestamp":1,"steps":1,"items":[]})"),
+            "unknown record field \"items\"; the nearest is \"steps\"");
+  EXPECT_EQ(errorOf("STAP", R"({"hex":"","timestamp":1})"),
+            "unknown record field \"timestamp\"; the nearest is \"hex\"");
   EXPECT_EQ(errorOf("PHYAC", R"({"timestamp":1,"items":[{"class":1,"seq":1,"level":1}]})"),
-            "unknown record field \"level\"");
+            "unknown record field \"level\"; the nearest is \"seq\"");
 }
 
 TEST(RecordCodec, RefusesMissingFields) {

@@ -176,6 +176,13 @@ TEST_F(TraceReading, RefusesLinesThatAreNotJson) {
   }
 }
 
+TEST_F(TraceReading, TakesAByteOrderMarkInFront) {
+  TraceReader reader = readerOf("\xEF\xBB\xBF{\"call\":\"uninit\"}\n{\"call\":\"uninit\"}\n");
+  EXPECT_TRUE(reader.next());
+  EXPECT_TRUE(reader.next());
+  EXPECT_EQ(errorOf("\n\xEF\xBB\xBF{\"call\":\"uninit\"}").substr(0, 10), "not JSON: ");
+}
+
 TEST_F(TraceReading, GoesOnAfterALongLine) {
   const std::string note(3'000'000, 'x');
   TraceReader reader = readerOf(R"({"call":"uninit","note":")" + note + "\"}\n{\"call\":\"uninit\"}\n");

@@ -38,7 +38,8 @@ void declareExplain(CLI::App& app, Action& action) {
       "Exit status: 0; 1 when the output cannot be written; 2 for bad input, such as an option that is not JSON.");
   auto arguments = std::make_shared<ExplainArguments>();
   command->add_option("TRACE", arguments->subject, "a trace (- is standard input), or the name of a sensor")
-      ->required();
+      ->required()
+      ->type_name("TRACE or SENSOR");
   auto* options = command->add_option("OPTION", arguments->options, "the option string of a session on the sensor");
   ExplanationExtent& extent = arguments->form.extent;
   auto* records = command->add_flag("--records", extent.records, "explain what became of each record, too");

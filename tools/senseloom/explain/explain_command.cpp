@@ -9,6 +9,7 @@
 #include "explain/explanation_text.h"
 #include "explain/log_capture.h"
 #include "input_error.h"
+#include "model/nearest_name.h"
 #include "plot/replay_plot.h"
 #include "replay/replay_progress.h"
 #include "terminal/interrupt.h"
@@ -28,7 +29,10 @@ void requireObject(const std::string& session, const std::string& option) {
 
 // A mistyped sensor looks like the name of a file.
 TraceReader openTrace(const std::string& file) try { return TraceReader(file); } catch (const InputError& error) {
-  throw InputError(std::string(error.what()) + ", and no sensor has that name");
+  const std::string nearest = nearestSensor(file);
+  const bool isMistyped = model::editDistance(file, nearest) <= 2;
+  throw InputError(std::string(error.what()) + ", and no sensor has that name" +
+                   (isMistyped ? "; the nearest is \"" + nearest + '"' : ""));
 }
 
 std::unique_ptr<ExplanationOutput> makeOutput(std::FILE* out, const ExplanationForm& form) {

@@ -78,7 +78,8 @@ void ExplanationText::printQuietCalls() {
   if (quietCalls == 0) return;
   beginBlock();
   begun = true;
-  std::fprintf(out, "lines %zu to %zu: %zu more calls, after which everything is merged to what it was (--all shows them)\n",
+  std::fprintf(out,
+               "lines %zu to %zu: %zu more calls, after which everything is merged to what it was (--all shows them)\n",
                firstQuietLine, lastQuietLine, quietCalls);
   quietCalls = 0;
 }

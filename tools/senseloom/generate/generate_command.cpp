@@ -2,8 +2,10 @@
 
 #include <CLI/CLI.hpp>
 #include <cstdint>
+#include <limits>
 #include <memory>
 
+#include "command_line/option_value.h"
 #include "generate/commute_generator.h"
 
 namespace senseloom::tool {
@@ -24,8 +26,12 @@ void declareGenerate(CLI::App& app, Action& action) {
   auto arguments = std::make_shared<CommuteArguments>();
   command->add_option("--seed", arguments->seed, "decides everything: the same seed gives the same trace")
       ->required()
-      ->check(CLI::NonNegativeNumber);
-  command->add_option("--records", arguments->records, "number of records")->capture_default_str();
+      ->type_name("N")
+      ->check(wholeNumber(0, std::numeric_limits<uint64_t>::max()));
+  command->add_option("--records", arguments->records, "number of records")
+      ->type_name("N")
+      ->check(wholeNumber(0, std::numeric_limits<uint32_t>::max()))
+      ->capture_default_str();
   command->callback([arguments, &action] {
     action = [arguments](std::FILE* out) { CommuteGenerator(out, arguments->seed, arguments->records).write(); };
   });

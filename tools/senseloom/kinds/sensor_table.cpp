@@ -2,8 +2,10 @@
 
 #include <algorithm>
 #include <iterator>
+#include <vector>
 
 #include "input_error.h"
+#include "model/nearest_name.h"
 #include "option/all_options.h"
 
 namespace senseloom::tool {
@@ -77,10 +79,17 @@ const Sensor* findSensor(std::string_view name) {
   return find(name);
 }
 
+std::string nearestSensor(const std::string& name) {
+  std::vector<std::string_view> names;
+  for (const Sensor& sensor : kSensors) names.emplace_back(sensor.name);
+  return std::string(model::nearestName(name, names));
+}
+
 const Sensor& sensorNamed(const std::string& name) {
   const Sensor* sensor = find(name);
   if (sensor == nullptr) {
-    throw InputError("unknown sensor \"" + name + "\": `senseloom sensors` prints those that are known");
+    throw InputError("unknown sensor \"" + name + "\": the nearest is \"" + nearestSensor(name) +
+                     "\"; `senseloom sensors` prints all");
   }
   return *sensor;
 }

@@ -60,6 +60,8 @@ constexpr bool hasClasses(const Sensor& sensor) {
 
 // Null if there is no such sensor.
 const Sensor* findSensor(std::string_view name);
+// The sensor whose name is most like this one.
+std::string nearestSensor(const std::string& name);
 // Throws InputError if there is no such sensor.
 const Sensor& sensorNamed(const std::string& name);
 

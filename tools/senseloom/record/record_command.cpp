@@ -1,10 +1,12 @@
 #include "record/record_command.h"
 
 #include <CLI/CLI.hpp>
+#include <limits>
 #include <memory>
 #include <string>
 #include <vector>
 
+#include "command_line/option_value.h"
 #include "record/attached_process.h"
 #include "record/recorded_program.h"
 
@@ -36,6 +38,7 @@ void declareRecord(CLI::App& app, Action& action) {
   auto arguments = std::make_shared<RecordArguments>();
   RecordingArguments& recording = arguments->recording;
   command->add_option("-o,--output", recording.file, "the trace; %p becomes the id of the process")
+      ->type_name("FILE")
       ->capture_default_str();
   command->add_flag("--force", recording.force, "replace a file that holds something");
   command->add_option("--max-size", recording.maxSize, "begin another file after so many bytes; 10k, 10M, 10G")
@@ -43,9 +46,10 @@ void declareRecord(CLI::App& app, Action& action) {
       ->type_name("SIZE");
   auto* follow = command->add_flag("--follow-forks", recording.followForks, "record forked children, too");
   auto* attach = command->add_option("--attach", arguments->process, "record a process that runs, until interrupted")
-                     ->check(CLI::PositiveNumber)
+                     ->check(wholeNumber(1, std::numeric_limits<int32_t>::max()))
                      ->type_name("PID");
-  auto* program = command->add_option("COMMAND", arguments->command, "the program and its arguments");
+  auto* program =
+      command->add_option("COMMAND", arguments->command, "the program and its arguments")->type_name("PROGRAM");
   attach->excludes(program)->excludes(follow);
   command->callback([arguments, attach, program, &action] {
     if (attach->empty() && program->empty()) throw CLI::RequiredError("COMMAND");

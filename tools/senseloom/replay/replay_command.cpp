@@ -9,6 +9,7 @@
 #include <memory>
 #include <string>
 
+#include "command_line/option_value.h"
 #include "plot/plot_options.h"
 #include "plot/replay_plot.h"
 #include "replay/check_output.h"
@@ -80,10 +81,10 @@ void declareReplay(CLI::App& app, Action& action) {
   CLI::App* command = app.add_subcommand("replay", "Replay a trace and print what each client receives.");
   command->footer(
       "A trace is JSON Lines, one call of the library a line. Sessions that it leaves open are closed at its end.\n"
-      "Exit status: 0, also when calls failed; 1 when --check finds a difference or the output cannot be written;\n"
+      "Exit status: 0, also when calls failed; 1 when --check finds a difference or the output cannot be written; "
       "2 for bad input.");
   auto arguments = std::make_shared<ReplayArguments>();
-  command->add_option("FILE", arguments->file, "the trace; - is standard input")->required();
+  command->add_option("FILE", arguments->file, "the trace; - is standard input")->required()->type_name("FILE");
   auto* json = command->add_flag("--json", arguments->json, "print one JSON object per call and session");
   auto* quiet = command->add_flag("--quiet", arguments->quiet, "print only a summary, one row per client");
   auto* all = command->add_flag("--all", arguments->all, "print the records that delivered nothing, too");
@@ -92,7 +93,8 @@ void declareReplay(CLI::App& app, Action& action) {
   quiet->excludes(all)->excludes(check);
   check->excludes(all);
   command->add_option("--log", arguments->log, "print log lines from this level on, on standard error")
-      ->check(CLI::IsMember({"debug", "info", "warn", "error", "none"}))
+      ->type_name("LEVEL")
+      ->check(oneOf({"debug", "info", "warn", "error", "none"}))
       ->capture_default_str();
   addPlotOptions(*command, arguments->plot);
   command->callback([arguments, &action] { action = [arguments](std::FILE* out) { replay(out, *arguments); }; });

@@ -1,8 +1,10 @@
 #include "status/status_command.h"
 
 #include <CLI/CLI.hpp>
+#include <limits>
 #include <memory>
 
+#include "command_line/option_value.h"
 #include "status/status_output.h"
 
 namespace senseloom::tool {
@@ -14,7 +16,10 @@ void declareStatus(CLI::App& app, Action& action) {
       "The sessions of each sensor, what each asked for last, what was merged of it, and its records so far.\n"
       "Exit status: 0; 2 when there is no such process, or it has not the recording library.");
   auto process = std::make_shared<pid_t>(0);
-  command->add_option("PID", *process, "the process")->required()->check(CLI::PositiveNumber);
+  command->add_option("PID", *process, "the process")
+      ->required()
+      ->type_name("PID")
+      ->check(wholeNumber(1, std::numeric_limits<pid_t>::max()));
   command->callback([process, &action] { action = [process](std::FILE* out) { printStatus(out, *process); }; });
 }
 

@@ -1,8 +1,10 @@
 #include "trace/field_check.h"
 
 #include <algorithm>
+#include <vector>
 
 #include "input_error.h"
+#include "model/nearest_name.h"
 
 namespace senseloom::tool {
 
@@ -13,9 +15,14 @@ std::string quotedField(std::string_view field) {
 void checkFields(json_t* object, std::initializer_list<const char*> fields) {
   const char* key;
   json_t* value;
+  std::vector<std::string_view> known;
+  for (const char* field : fields) {
+    if (field != nullptr) known.emplace_back(field);
+  }
   json_object_foreach(object, key, value) {
-    const auto isKey = [key](const char* field) { return field != nullptr && std::string_view(field) == key; };
-    if (std::none_of(fields.begin(), fields.end(), isKey)) throw InputError("unknown " + quotedField(key));
+    if (std::find(known.begin(), known.end(), key) != known.end()) continue;
+    throw InputError("unknown " + quotedField(key) + "; the nearest is \"" +
+                     std::string(model::nearestName(key, known)) + '"');
   }
   for (const char* field : fields) {
     if (field != nullptr && json_object_get(object, field) == nullptr) {

@@ -12,6 +12,7 @@ namespace senseloom::tool {
 namespace {
 
 constexpr size_t kChunk = 1 << 16;
+constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";  // which some editors put in front
 
 std::unique_ptr<ByteStream> open(const std::string& file, const std::string& name) try {
   return openBytes(file);
@@ -69,6 +70,7 @@ Json TraceReader::nextObject() {
   do {
     if (isInterrupted() || !readLine()) return nullptr;
     line = std::string_view(buffer).substr(lineStart, lineLength);
+    if (lineNumber == 1 && line.starts_with(kByteOrderMark)) line.remove_prefix(kByteOrderMark.size());
     // Room that a recording has reserved, and did not come to use.
     if (isRecording && line.front() == '\0') return nullptr;
   } while (line.find_first_not_of(" \t\r\n") == std::string_view::npos);
