@@ -45,6 +45,7 @@ std::string headLine(uint32_t part, int64_t startedAt) {
   line.addInteger(member::kFormat, tool::kTraceFormat);
   line.addText(member::kTool, SENSELOOM_VERSION);
   line.addText(member::kLibrary, libraryFile());
+  if (const auto build = libraryBuild(); !build.empty()) line.addHexText(member::kLibraryBuild, build);
   line.addText(member::kProgram, programFile());
   line.addInteger(member::kProcess, getpid());
   line.addInteger(member::kBits, 8 * sizeof(void*));

@@ -2,7 +2,11 @@
 
 #include <android/log.h>
 #include <dlfcn.h>
+#include <elf.h>
+#include <link.h>
 
+#include <cstddef>
+#include <cstring>
 #include <type_traits>
 
 #include "recorder_names.h"
@@ -45,6 +49,43 @@ Library load() {
   return found;
 }
 
+Dl_info libraryInfo() {
+  Dl_info info{};
+  dladdr(reinterpret_cast<void*>(library().openSession), &info);
+  return info;
+}
+
+struct BuildSearch {
+  const void* base;  // of the library
+  std::span<const uint8_t> found;
+};
+
+// Notes are a header, a name and what they say, each of the latter two rounded up to four bytes.
+std::span<const uint8_t> buildIn(const uint8_t* note, const uint8_t* end) {
+  constexpr size_t kAlignment = 4;
+  const auto roundedUp = [](size_t size) { return (size + kAlignment - 1) / kAlignment * kAlignment; };
+  while (note + sizeof(ElfW(Nhdr)) <= end) {
+    ElfW(Nhdr) header;
+    std::memcpy(&header, note, sizeof header);
+    const bool isGnu = header.n_namesz == sizeof "GNU" && std::memcmp(note + sizeof header, "GNU", sizeof "GNU") == 0;
+    const uint8_t* said = note + sizeof header + roundedUp(header.n_namesz);
+    if (isGnu && header.n_type == NT_GNU_BUILD_ID && said + header.n_descsz <= end) return {said, header.n_descsz};
+    note = said + roundedUp(header.n_descsz);
+  }
+  return {};
+}
+
+int findBuild(dl_phdr_info* object, size_t /*size*/, void* wanted) {
+  auto* search = static_cast<BuildSearch*>(wanted);
+  if (reinterpret_cast<const void*>(object->dlpi_addr) != search->base) return 0;
+  for (const ElfW(Phdr) & segment : std::span(object->dlpi_phdr, object->dlpi_phnum)) {
+    if (segment.p_type != PT_NOTE || !search->found.empty()) continue;
+    const auto* notes = reinterpret_cast<const uint8_t*>(object->dlpi_addr + segment.p_vaddr);
+    search->found = buildIn(notes, notes + segment.p_memsz);
+  }
+  return 1;
+}
+
 }  // namespace
 
 const Library& library() {
@@ -53,10 +94,14 @@ const Library& library() {
 }
 
 const char* libraryFile() {
-  Dl_info info{};
-  void* function = reinterpret_cast<void*>(library().openSession);
-  if (dladdr(function, &info) == 0 || info.dli_fname == nullptr) return "";
-  return info.dli_fname;
+  const char* name = libraryInfo().dli_fname;
+  return name == nullptr ? "" : name;
+}
+
+std::span<const uint8_t> libraryBuild() {
+  BuildSearch search{.base = libraryInfo().dli_fbase, .found = {}};
+  dl_iterate_phdr(findBuild, &search);
+  return search.found;
 }
 
 }  // namespace senseloom::trace

@@ -1,5 +1,8 @@
 #pragma once
 
+#include <cstdint>
+#include <span>
+
 #include "senseloom.h"
 
 namespace senseloom::trace {
@@ -28,5 +31,8 @@ const Library& library();
 
 // The file that they are in; empty without one.
 const char* libraryFile();
+
+// The number that the linker gave to the library's build; empty if it gave none.
+std::span<const uint8_t> libraryBuild();
 
 }  // namespace senseloom::trace

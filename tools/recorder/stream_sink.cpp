@@ -60,6 +60,10 @@ OpenedSink openStream(const std::string& name, const struct stat& status) {
     close(file);
     file = open(name.c_str(), O_RDWR | kFlags);
     if (file < 0) return {nullptr, std::strerror(errno)};
+    if (const char* trouble = takeLock(file)) {
+      close(file);
+      return {nullptr, trouble};
+    }
   }
   auto* sink = new (std::nothrow) StreamSink(file);
   if (sink != nullptr) return {sink, nullptr};

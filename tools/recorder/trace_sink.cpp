@@ -28,12 +28,8 @@ OpenedSink refuse(int descriptor, const char* trouble) {
   return {nullptr, trouble};
 }
 
-bool isLocked(int descriptor) {
-  return flock(descriptor, LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK;
-}
-
 OpenedSink mapped(int descriptor, const std::string& name) {
-  if (isLocked(descriptor)) return refuse(descriptor, "another recording is written to the file");
+  if (const char* trouble = takeLock(descriptor)) return refuse(descriptor, trouble);
   auto* sink = new (std::nothrow) MappedFile(descriptor, name);
   return sink != nullptr ? OpenedSink{sink, nullptr} : refuse(descriptor, "out of memory");
 }
@@ -41,7 +37,7 @@ OpenedSink mapped(int descriptor, const std::string& name) {
 // The old file stays whole for whoever has it open, and is gone from its folder only when it is known to be the one
 // that the user wants to have replaced.
 OpenedSink replace(int old, const std::string& name, const std::string& replaces) {
-  if (isLocked(old)) return refuse(old, "another recording is written to the file");
+  if (const char* trouble = takeLock(old)) return refuse(old, trouble);
   if (replaces.empty() || identityOf(name) != replaces) return refuse(old, "the file is not empty");
   if (unlink(name.c_str()) != 0) return refuse(old, errorText());
   close(old);
@@ -49,6 +45,11 @@ OpenedSink replace(int old, const std::string& name, const std::string& replaces
 }
 
 }  // namespace
+
+const char* takeLock(int descriptor) {
+  const bool isTaken = flock(descriptor, LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK;
+  return isTaken ? "another recording is written to the file" : nullptr;
+}
 
 OpenedSink openNewFile(const std::string& name) {
   const int descriptor = open(name.c_str(), O_RDWR | O_CREAT | O_EXCL | kFlags, kOwnerOnly);

@@ -27,6 +27,9 @@ struct OpenedSink {
   const char* trouble = nullptr;
 };
 
+// Locks a file or a pipe for a recording. Returns why that is not possible, or null.
+const char* takeLock(int descriptor);
+
 // Opens a new file, or a pipe or a device. `replaces` is the identity of a file with content that may be replaced.
 OpenedSink openSink(const std::string& name, const std::string& replaces);
 

@@ -200,5 +200,17 @@ TEST(RecordFiles, WritesToANamedPipe) {
 )");
 }
 
+TEST(RecordFiles, RefusesThePipeOfARecordingThatGoesOn) {
+  const ScratchFile pipe("busy_pipe");
+  ASSERT_EQ(mkfifo(pipe.name.c_str(), 0600), 0);
+  const std::fstream reader(pipe.name);  // writes, too, so it does not wait for the other end
+  BackgroundProgram first({TOOL_FILE, "record", "-o", pipe.name, "--", DRIVEN_FILE}, recordingEnvironment());
+  EXPECT_EQ(first.ask("open a LIFT"), "1");
+  const ToolRun second = recordDriven(pipe.name, kLines);
+  EXPECT_EQ(second.err, "senseloom: " + pipe.name + ": another recording is written to it\n");
+  EXPECT_EQ(second.status, 2);
+  EXPECT_EQ(first.finish().status, 0);
+}
+
 }  // namespace
 }  // namespace senseloom::tool

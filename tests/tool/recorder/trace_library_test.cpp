@@ -6,6 +6,7 @@
 #include <fstream>
 #include <string>
 
+#include "background_program.h"
 #include "recording.h"
 
 namespace senseloom::tool {
@@ -134,6 +135,18 @@ TEST(TraceLibrary, GivesAReaderUpThatDoesNotRead) {
   const ToolRun run = runTraced(pipe.name, kReplay, calls);
   EXPECT_EQ(run.status, 0);
   EXPECT_NE(run.err.find("calls are not recorded: nobody reads the pipe\n"), std::string::npos) << run.err;
+}
+
+TEST(TraceLibrary, LeavesThePipeToTheProcessThatWasFirst) {
+  const ScratchFile pipe("shared");
+  ASSERT_EQ(mkfifo(pipe.name.c_str(), 0600), 0);
+  const std::fstream reader(pipe.name);
+  Environment environment = recordingEnvironment();
+  environment.emplace_back("LD_AUDIT", AUDIT_LIBRARY);
+  environment.emplace_back("SENSELOOM_TRACE", pipe.name);
+  BackgroundProgram first({DRIVEN_FILE}, environment);
+  EXPECT_EQ(first.ask("open a LIFT"), "1");
+  expectUndisturbed(runTraced(pipe.name, kReplay, kOpen + kDispatch), "another recording is written to the file", "3");
 }
 
 TEST(TraceLibrary, KeepsTheTraceThatTheFileHolds) {

@@ -110,6 +110,7 @@ void Recording::openPipe(int out) {
   } else {
     const int file = open(arguments.file.c_str(), O_WRONLY | O_CLOEXEC);  // waits for the reader
     if (file < 0) fail(arguments.file, std::strerror(errno));
+    if (flock(file, LOCK_EX | LOCK_NB) != 0) fail(arguments.file, "another recording is written to it");
     output = makeStreamOutput(file);
   }
 }

@@ -49,6 +49,7 @@ inline constexpr char kTook[] = "tookNs";  // nanoseconds in the library
 inline constexpr char kFormat[] = "format";
 inline constexpr char kTool[] = "tool";
 inline constexpr char kLibrary[] = "library";
+inline constexpr char kLibraryBuild[] = "libraryBuild";
 inline constexpr char kProgram[] = "program";
 inline constexpr char kProcess[] = "process";
 inline constexpr char kBits[] = "bits";

@@ -34,8 +34,7 @@ std::string escaped(std::string_view text) {
 
 void TraceLine::addText(std::string_view key, std::string_view text) {
   if (std::any_of(text.begin(), text.end(), isBeyondAscii)) {
-    addKey(std::string(key) + "Hex");
-    addHex({reinterpret_cast<const uint8_t*>(text.data()), text.size()});
+    addHexText(std::string(key) + "Hex", {reinterpret_cast<const uint8_t*>(text.data()), text.size()});
   } else {
     addKey(key);
     addQuoted(escaped(text));
@@ -54,8 +53,7 @@ void TraceLine::addNull(std::string_view key) {
 
 void TraceLine::addBytes(std::string_view key, std::span<const uint8_t> bytes) {
   beginObject(key);
-  addKey(member::kHex);
-  addHex(bytes);
+  addHexText(member::kHex, bytes);
   endObject();
 }
 
@@ -90,9 +88,13 @@ void TraceLine::addProperty(int32_t id, std::span<const uint8_t> value) {
   beginElement();
   addInteger(member::kId, id);
   addInteger(member::kSize, static_cast<int64_t>(value.size()));
-  addKey(member::kValue);
-  addHex(value);
+  addHexText(member::kValue, value);
   endObject();
+}
+
+void TraceLine::addHexText(std::string_view key, std::span<const uint8_t> bytes) {
+  addKey(key);
+  addHex(bytes);
 }
 
 void TraceLine::addThreads(std::span<const int> threads) {

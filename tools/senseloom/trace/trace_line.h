@@ -38,6 +38,9 @@ class TraceLine {
   // An element of "properties": {"id","size","value"} with the value as hexadecimal digits.
   void addProperty(int32_t id, std::span<const uint8_t> value);
 
+  // A string of hexadecimal digits.
+  void addHexText(std::string_view key, std::span<const uint8_t> bytes);
+
   // "threads": numbers of threads.
   void addThreads(std::span<const int> threads);
 
