@@ -5,11 +5,10 @@
 #include <iostream>
 
 #include "input_error.h"
+#include "trace/byte_order_mark.h"
 
 namespace senseloom::tool {
 namespace {
-
-constexpr char kByteOrderMark[] = "\xEF\xBB\xBF";
 
 // Takes a cell off the front of a line, with the comma behind it. `more`: whether there was one.
 std::string takeCell(std::string_view& line, bool& more) {
@@ -43,7 +42,7 @@ CsvReader::CsvReader(const std::string& file)
 std::vector<std::string> CsvReader::next() {
   for (std::string line; std::getline(*input, line);) {
     ++lineNumber;
-    if (lineNumber == 1 && line.starts_with(kByteOrderMark)) line.erase(0, std::strlen(kByteOrderMark));
+    if (lineNumber == 1 && line.starts_with(kByteOrderMark)) line.erase(0, kByteOrderMark.size());
     if (!line.empty() && line.back() == '\r') line.pop_back();
     if (line.find_first_not_of(" \t") == std::string::npos) continue;
     std::vector<std::string> cells;

@@ -6,13 +6,13 @@
 
 #include "input_error.h"
 #include "terminal/interrupt.h"
+#include "trace/byte_order_mark.h"
 #include "trace/time_unit.h"
 
 namespace senseloom::tool {
 namespace {
 
 constexpr size_t kChunk = 1 << 16;
-constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";  // which some editors put in front
 
 std::unique_ptr<ByteStream> open(const std::string& file, const std::string& name) try {
   return openBytes(file);
