@@ -1,4 +1,4 @@
-"""Android.bp: what it says of libsenseloom."""
+"""Android.bp: what it says of a module."""
 
 import ast
 import pathlib
@@ -6,17 +6,32 @@ import re
 import sys
 
 
-class Blueprint:
-    """`properties` has those of the one module: a text, a list of texts, a bool, or such a dictionary again."""
-
-    def __init__(self, root):
-        self.root = pathlib.Path(root)
-        text = re.sub(r"^\s*//.*", "", (self.root / "Android.bp").read_text(), flags=re.MULTILINE)
-        module = re.fullmatch(r"\s*cc_library_shared\s*(\{.*\})\s*", text, re.DOTALL)
+def parsed(text):
+    """The modules by name, each a dictionary of texts, lists of texts, bools, or such dictionaries again."""
+    text = re.sub(r"^\s*//.*", "", text, flags=re.MULTILINE)
+    modules = {}
+    for body in re.findall(r"^cc_\w+ (\{.*?^\})", text, re.MULTILINE | re.DOTALL):
         # Apart from names without quotes, this is how Python writes a dictionary.
-        quoted = re.sub(r"\b(\w+)(?=\s*:)", r'"\1"', module[1])
+        quoted = re.sub(r"\b(\w+)(?=: )", r'"\1"', body)
         quoted = re.sub(r"\b(true|false)\b", lambda word: word[1].capitalize(), quoted)
-        self.properties = ast.literal_eval(quoted)
+        module = ast.literal_eval(quoted)
+        modules[module["name"]] = module
+    return modules
+
+
+def merged(modules, name):
+    """A module with what its defaults say: their lists come first, and what else it says itself counts."""
+    properties = {}
+    for source in [merged(modules, default) for default in modules[name].get("defaults", [])] + [modules[name]]:
+        for key, value in source.items():
+            properties[key] = properties.get(key, []) + value if isinstance(value, list) else value
+    return properties
+
+
+class Blueprint:
+    def __init__(self, root, module="libsenseloom"):
+        self.root = pathlib.Path(root)
+        self.properties = merged(parsed((self.root / "Android.bp").read_text()), module)
 
     def __getitem__(self, name):
         if name not in self.properties:
@@ -30,7 +45,7 @@ class Blueprint:
 
     def include_dirs(self):
         """The folders of the project that sources take headers from, relative to the root."""
-        return self["local_include_dirs"] + self["export_include_dirs"]
+        return self["local_include_dirs"] + self.properties.get("export_include_dirs", [])
 
     def flags(self):
         """What C++ sources are compiled with. Without RTTI, unless it is asked for: that is the platform's default."""

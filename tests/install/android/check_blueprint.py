@@ -1,7 +1,7 @@
 #!/usr/bin/env python3
-"""Fails unless Android.bp builds the library as CMake does for Android: check_blueprint.py ROOT BUILD
+"""Fails unless Android.bp builds a library as CMake does for Android: check_blueprint.py ROOT BUILD MODULE TARGET LIBRARY
 
-BUILD is a build for Android, from whose commands CMake's way is read."""
+BUILD is a build for Android, from whose commands CMake's way is read; TARGET makes LIBRARY in it."""
 
 import os
 import pathlib
@@ -48,22 +48,27 @@ def includes(command, root, build):
 
 def needed(library):
     dynamic = output_of("readelf", "--wide", "--dynamic", library)
-    return {name for name in re.findall(r"\(NEEDED\).*\[(\w+)\.so\]", dynamic) if name not in RUNTIME}
+    return {name for name in re.findall(r"\(NEEDED\).*\[([\w-]+)\.so\]", dynamic) if name not in RUNTIME}
 
 
-def exported_headers(root):
+def soname(library):
+    return re.findall(r"\(SONAME\).*\[(.+)\]", output_of("readelf", "--wide", "--dynamic", library))
+
+
+def exported_headers(root, target):
     text = pathlib.Path(root, "src/CMakeLists.txt").read_text()
-    return set(re.findall(r"target_include_directories\(senseloom PUBLIC \$\{PROJECT_SOURCE_DIR\}/([^)]*)\)", text))
+    return set(re.findall(rf"target_include_directories\({target} PUBLIC \$\{{PROJECT_SOURCE_DIR\}}/([^)]*)\)", text))
 
 
 def main():
-    root, build = (os.path.abspath(argument) for argument in sys.argv[1:])
-    blueprint = Blueprint(root)
-    compiling, linking = commands(build, "senseloom")
+    root, build = (os.path.abspath(argument) for argument in sys.argv[1:3])
+    module, target, library = sys.argv[3:]
+    library = os.path.join(build, library)
+    blueprint = Blueprint(root, module)
+    compiling, linking = commands(build, target)
     own_folders, other_folders = includes(compiling[0], root, build)
     version_scripts = re.findall(r"--version-script=(\S+)", " ".join(linking))
     headers = {"libhardware_headers"} if other_folders else set()
-    library = os.path.join(build, "lib/libsenseloom.so")
 
     failed = False
 
@@ -79,10 +84,11 @@ def main():
     for by_cmake in {frozenset(code_flags(line)) for line in compiling}:
         compare("flags", flags - DEFAULTS, by_cmake - OF_THE_PLATFORM)
     compare("folders of headers", set(blueprint.include_dirs()), own_folders)
-    compare("modules of headers", set(blueprint["header_libs"]), headers)
-    compare("exported headers", set(blueprint["export_include_dirs"]), exported_headers(root))
+    compare("modules of headers", set(blueprint.properties.get("header_libs", [])), headers)
+    compare("exported headers", set(blueprint.properties.get("export_include_dirs", [])), exported_headers(root, target))
     compare("version scripts", {blueprint["version_script"]}, {os.path.relpath(file, root) for file in version_scripts})
     compare("libraries", set(blueprint["shared_libs"]), needed(library))
+    compare("sonames", {blueprint.properties.get("stem", module) + ".so"}, set(soname(library)))
     # Without -Wno-error a platform's build adds -Werror itself.
     compare("warnings", {flag for flag in blueprint.flags() if flag.endswith("error")}, {"-Wno-error"})
     sys.exit(failed)
