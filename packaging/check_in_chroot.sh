@@ -12,7 +12,7 @@ mmdebstrap --quiet --variant=minbase --architectures=amd64,i386 --skip=cleanup/a
   "deb http://deb.debian.org/debian bookworm main"
 mkdir "$root/packages"
 cp "$packages"/*.deb "$root/packages"
-in_root() { chroot "$root" env DEBIAN_FRONTEND=noninteractive LC_ALL=C "$@"; }
+in_root() { unshare --root="$root" --mount-proc --pid --fork env DEBIAN_FRONTEND=noninteractive LC_ALL=C "$@"; }
 echo "Installing the packages"
 in_root sh -c "apt-get install -y --no-install-recommends /packages/*.deb" >"$root/log" 2>&1 || { cat "$root/log"; exit 1; }
 
