@@ -34,7 +34,7 @@ BUILD := build/install
 install:
 	$(call install,build)
 	echo "Building in $(BUILD), which can take some minutes."
-	[ -e $(BUILD)/CMakeCache.txt ] || cmake -G Ninja -B $(BUILD) -D BUILD_TESTING=OFF >/dev/null
+	[ -e $(BUILD)/build.ninja ] || cmake -G Ninja -B $(BUILD) -D BUILD_TESTING=OFF >/dev/null
 	cmake --build $(BUILD) && cmake --install $(BUILD) --prefix $(PREFIX)
 
 # Makes the Debian packages, of the library in both word sizes, and checks them by lintian.
