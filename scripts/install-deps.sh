@@ -8,7 +8,7 @@ set -euo pipefail
 # Per task: packages that are programs or headers, and libraries, which 32-bit x86 needs in its own version, too.
 declare -A programs=(
   [build]="g++ cmake ninja-build libcli11-dev zlib1g-dev"
-  [test]="abigail-tools binutils clang clang-13 doxygen dpkg-dev file fish groff-base libc++-dev libc++abi-dev lintian lld locales pkg-config python3 python3-jsonschema python3-numpy valgrind zsh"
+  [test]="abigail-tools binutils chromium chromium-driver clang clang-13 doxygen dpkg-dev file fish fonts-dejavu-core groff-base libc++-dev libc++abi-dev lintian lld locales pkg-config python3 python3-jsonschema python3-numpy valgrind zsh"
   [packages]="dpkg-dev lintian mmdebstrap python3"
   [bench]="libboost-dev librange-v3-dev"
   [fuzz]="clang libclang-rt-14-dev" # brings the runtime libraries of both word sizes
@@ -35,6 +35,8 @@ for task in "$@"; do
   if [ ${#more[@]} -gt 0 ]; then wanted+=("${more[@]/%/:$host}"); fi
   if [ "$host" = amd64 ] && [ ${#more[@]} -gt 0 ]; then wanted+=(g++-multilib "${more[@]/%/:i386}"); fi
 done
+# Where npm is there already, it may be a part of another package.
+if [[ " $* " == *" lint "* ]] && ! command -v npm >/dev/null; then wanted+=(npm); fi
 
 installed=$(dpkg-query --show --showformat '${Package} ${Status}\n${Package}:${Architecture} ${Status}\n' |
   sed -n 's/ install ok installed$//p')

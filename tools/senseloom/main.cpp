@@ -28,12 +28,13 @@
 #include "status/status_command.h"
 #include "sweep/sweep_command.h"
 #include "terminal/interrupt.h"
+#include "view/view_command.h"
 
 namespace senseloom::tool {
 namespace {
 
 // In the order of the help.
-constexpr Declare* kCommands[] = {declareReplay, declareExplain,  declareRecord,  declareStatus,
+constexpr Declare* kCommands[] = {declareReplay, declareExplain,  declareView,    declareRecord, declareStatus,
                                   declareSweep,  declareGenerate, declareConvert, declareSensors};
 
 constexpr int kFailure = 1;

@@ -16,14 +16,15 @@ RecordHues look(const char* sensor, const std::string& value, bool isResult = fa
 TEST(RecordHuesOf, ActivityAreThoseOfItsItems) {
   const RecordHues hues = look("PHYAC", "0300010011000900");
   EXPECT_EQ(hues.counts[1], 2U);
-  EXPECT_EQ(hues.counts[kOtherHue], 1U);  // class 9
+  EXPECT_EQ(hues.counts[9], 1U);
   EXPECT_EQ(hues.records, 1U);
   EXPECT_EQ(look("PHYAC", "0300010011").counts[1], 1U);  // ends before the second item
 }
 
-TEST(RecordHuesOf, ClassesAreTheirNumbersUpToSeven) {
+TEST(RecordHuesOf, ClassesAreTheirNumbersUpToSixteen) {
   EXPECT_EQ(look("GSFLK", "0700").counts[7], 1U);
-  EXPECT_EQ(look("GSFLK", "0800").counts[kOtherHue], 1U);
+  EXPECT_EQ(look("GSFLK", "1000").counts[16], 1U);
+  EXPECT_EQ(look("GSFLK", "1100").counts[kOtherHue], 1U);
   EXPECT_EQ(look("GSFLK", "ffff").counts[kOtherHue], 1U);
   EXPECT_EQ(look("ISACT", "02000000").counts[2], 1U);
   EXPECT_EQ(look("GSFLK", "07").counts[kPlainHue], 1U);
@@ -52,6 +53,7 @@ TEST(HueText, NamesWhatAHueStandsFor) {
   EXPECT_EQ(text("GSFLK", 6), "class 6");
   EXPECT_EQ(text("STAP", 0), "no class");
   EXPECT_EQ(text("STAP", 3), "class 1 + 2");
+  EXPECT_EQ(text("STAP", 12), "class 3 + 4");
   EXPECT_EQ(text("GSFLK", kOtherHue), "other class");
   EXPECT_EQ(text("SCOUN", kPlainHue), "steps");
   EXPECT_EQ(text("PDR", kPlainHue), "items");

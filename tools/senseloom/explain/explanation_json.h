@@ -3,8 +3,12 @@
 #include <cstdio>
 
 #include "explain/explanation.h"
+#include "trace/json.h"
 
 namespace senseloom::tool {
+
+// What is told of a call: the member of that name below.
+Json toldJson(const ExplainedCall& call);
 
 // Prints explanations as JSON, an object a line:
 //

@@ -64,7 +64,7 @@ class Cells {
 
 }  // namespace
 
-void printFewSessions(std::FILE* out, const Sensor& sensor, const ExplainedNegotiation& negotiation, bool whole) {
+std::vector<TextRow> fewSessionsRows(const Sensor& sensor, const ExplainedNegotiation& negotiation, bool whole) {
   const Cells cells(sensor, negotiation);
   std::vector<TextRow> rows{{"key", "merged to"}};
   const auto finish = [&rows](const std::string& merged, const std::string& property, const std::string& decidedBy) {
@@ -82,7 +82,11 @@ void printFewSessions(std::FILE* out, const Sensor& sensor, const ExplainedNegot
     rows.back()[0] = name;
     finish("", text, "");
   }
-  printTable(out, rows);
+  return rows;
+}
+
+void printFewSessions(std::FILE* out, const Sensor& sensor, const ExplainedNegotiation& negotiation, bool whole) {
+  printTable(out, fewSessionsRows(sensor, negotiation, whole));
 }
 
 void printManySessions(std::FILE* out, const Sensor& sensor, const ExplainedNegotiation& negotiation, bool whole) {
@@ -112,7 +116,7 @@ void printManySessions(std::FILE* out, const Sensor& sensor, const ExplainedNego
   }
 }
 
-void printChains(std::FILE* out, const ExplainedNegotiation& negotiation, bool all) {
+std::vector<std::string> chainTexts(const ExplainedNegotiation& negotiation, bool all) {
   struct Chain {
     std::string session;
     std::string stages;
@@ -125,10 +129,16 @@ void printChains(std::FILE* out, const ExplainedNegotiation& negotiation, bool a
     if (!stages.empty() && (all || isNew)) chains.push_back({negotiation.names[i], stages});
   }
   const auto isSame = [](const Chain& one, const Chain& other) { return one.stages == other.stages; };
+  std::vector<std::string> texts;
   for (const auto& group : groupsOf(chains, isSame)) {
-    std::fprintf(out, "  chain of %s: %s\n", namesText(group, [](const Chain& chain) { return chain.session; }).c_str(),
-                 group.front()->stages.c_str());
+    texts.push_back("chain of " + namesText(group, [](const Chain& chain) { return chain.session; }) + ": " +
+                    group.front()->stages);
   }
+  return texts;
+}
+
+void printChains(std::FILE* out, const ExplainedNegotiation& negotiation, bool all) {
+  for (const std::string& text : chainTexts(negotiation, all)) std::fprintf(out, "  %s\n", text.c_str());
 }
 
 }  // namespace senseloom::tool

@@ -33,6 +33,7 @@ std::string optionText(const std::optional<std::string>& option) {
 }  // namespace
 
 void Plot::onOutcome(const CallOutcome& outcome) {
+  if (outcome.call.kind != CallKind::dispatch) joiner.end();
   if (outcome.sensor == nullptr) return;
   Group& group = groupOf(*outcome.sensor);
   PlotLane* client = clientOf(group, outcome.session);
@@ -61,8 +62,7 @@ void Plot::onOutcome(const CallOutcome& outcome) {
 
 void Plot::dispatch(const CallOutcome& outcome, Group& group, PlotLane* client) {
   const Sensor& sensor = *outcome.sensor;
-  if (outcome.call.line != recordLine) {
-    recordLine = outcome.call.line;
+  if (joiner.isNew(outcome)) {
     timestamp = recordField<uint64_t>(outcome.record, kTimestampOffset).value_or(timestamp);
     if (timeline.add(timestamp)) {
       for (Group& each : groups) {

@@ -6,6 +6,7 @@
 
 #include "plot/plot_lane.h"
 #include "plot/timeline.h"
+#include "trace/record_joiner.h"
 #include "trace/replayer.h"
 
 namespace senseloom::tool {
@@ -36,7 +37,7 @@ class Plot final : public ReplayObserver {
   Timeline timeline;
   std::vector<Group> groups;
   size_t clients = 0;
-  size_t recordLine = 0;  // of the last record, to recognise one that goes to several sessions
+  RecordJoiner joiner;
   uint64_t timestamp = 0;
   bool cut = false;
 };

@@ -11,6 +11,7 @@ CLI::Option* addPlotOptions(CLI::App& command, PlotArguments& plot) {
       .add_option("--class-names", plot.classNames, "names for the classes in the picture, from class 0 on: A,B,...")
       ->type_name("NAMES")
       ->delimiter(',')
+      ->allow_extra_args(false)
       ->needs(file);
   return file;
 }

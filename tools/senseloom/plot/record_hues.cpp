@@ -40,7 +40,7 @@ RecordHues ofAmount(int64_t amount) {
 
 std::string classSetText(size_t set) {
   std::string text;
-  for (size_t bit = 0; bit < 3; ++bit) {
+  for (size_t bit = 0; set >> bit != 0; ++bit) {
     if ((set >> bit & 1) != 0) text += (text.empty() ? "class " : " + ") + std::to_string(bit + 1);
   }
   return text.empty() ? "no class" : text;

@@ -11,11 +11,11 @@
 
 namespace senseloom::tool {
 
-// What has a colour of its own in a picture: each of the classes 0 to 7, or each set of the first three classes; all
+// What has a colour of its own in a picture: each of the classes 0 to 16, or each set of the first four classes; all
 // other classes together; and records that show no class.
-inline constexpr size_t kHues = 10;
-inline constexpr size_t kOtherHue = 8;
-inline constexpr size_t kPlainHue = 9;
+inline constexpr size_t kHues = 19;
+inline constexpr size_t kOtherHue = 17;
+inline constexpr size_t kPlainHue = 18;
 
 // What a picture shows of one or more records.
 struct RecordHues {

@@ -19,12 +19,14 @@ void ReplayPlot::onEnd() {
   output->onEnd();
 }
 
+std::string traceTitle(const std::string& trace) {
+  return trace == "-" ? "standard input" : trace.substr(trace.rfind('/') + 1);
+}
+
 std::unique_ptr<ReplayObserver> withPlot(std::unique_ptr<ReplayObserver> output, const std::string& trace,
                                          const PlotArguments& arguments) {
   if (arguments.file.empty()) return output;
-  const size_t folder = trace.rfind('/');
-  std::string title = trace == "-" ? "standard input" : trace.substr(folder == std::string::npos ? 0 : folder + 1);
-  return std::make_unique<ReplayPlot>(std::move(output), std::move(title), arguments);
+  return std::make_unique<ReplayPlot>(std::move(output), traceTitle(trace), arguments);
 }
 
 }  // namespace senseloom::tool

@@ -31,6 +31,9 @@ class ReplayPlot final : public ReplayObserver {
   Plot plot;
 };
 
+// What a trace is called where it is shown: the name of its file.
+std::string traceTitle(const std::string& trace);
+
 // Adds a picture of a trace to an output, if one is wanted.
 std::unique_ptr<ReplayObserver> withPlot(std::unique_ptr<ReplayObserver> output, const std::string& trace,
                                          const PlotArguments& arguments);

@@ -7,6 +7,7 @@
 #include <utility>
 
 #include "kinds/option_data.h"
+#include "plot/palette.h"
 #include "plot/svg_canvas.h"
 #include "plot/svg_lane.h"
 #include "plot/svg_text.h"
@@ -32,12 +33,7 @@ constexpr SvgColour kColours[] = {
     {".note", "stroke", "#ffffff", "#0d1117"}, {".open", "fill", "#eff2f5", "#21262d"},
     {".tick", "stroke", "#1f2328", "#e6edf3"}, {".axis", "stroke", "#d1d9e0", "#3d444d"},
     {".cut", "stroke", "#1f2328", "#e6edf3"},  {".ask", "fill", "#8250df", "#bc8cff"},
-    {".no", "stroke", "#d1242f", "#ff7b72"},   {".h0", "fill", "#b6bec8", "#5b6572"},
-    {".h1", "fill", "#4878b8", "#5c94dd"},     {".h2", "fill", "#3f9c5a", "#4bb16b"},
-    {".h3", "fill", "#d5504b", "#ee6a62"},     {".h4", "fill", "#ec9a2f", "#f2ab4a"},
-    {".h5", "fill", "#8a63b8", "#a583d6"},     {".h6", "fill", "#e3c63c", "#ecd65c"},
-    {".h7", "fill", "#3aa6a6", "#4cc0bf"},     {".h8", "fill", "#93694e", "#b58a6c"},
-    {".h9", "fill", "#6b7a8c", "#8795a8"},
+    {".no", "stroke", "#d1242f", "#ff7b72"},
 };
 
 constexpr char kRules[] =
@@ -58,12 +54,21 @@ class Picture {
     addAxis();
     addKey();
     y = std::ceil(y);
-    return canvas.document(title, kWidth, y, kRules, kColours);
+    return canvas.document(title, kWidth, y, kRules, colours());
   }
 
  private:
   static double laneWidth() { return kWidth - kLeft - kRight; }
   double xOf(size_t bin) const { return kLeft + laneWidth() * plot.time().placeOf(bin); }
+
+  std::vector<SvgColour> colours() const {
+    std::vector<SvgColour> all(std::begin(kColours), std::end(kColours));
+    for (size_t hue = 0; hue < kHues; ++hue) {
+      const HueColour& colour = kHueColours[hue];
+      if (usedHues.counts[hue] > 0) all.push_back({colour.selector, "fill", colour.light, colour.dark});
+    }
+    return all;
+  }
 
   void addGroup(const Plot::Group& group) {
     const Sensor& sensor = *group.sensor;
@@ -93,6 +98,7 @@ class Picture {
       all.add(group.records.at(bin).received);
       for (const PlotLane& client : group.clients) all.add(client.at(bin).received);
     }
+    usedHues.add(all);
     const double left = kMargin + 260;
     double x = left;
     for (size_t hue = 0; hue < kHues; ++hue) {
@@ -254,6 +260,7 @@ class Picture {
   const Plot& plot;
   const std::vector<std::string>& classNames;
   SvgCanvas canvas;
+  RecordHues usedHues;
   double y = 0;  // down to where the picture is drawn
 };
 

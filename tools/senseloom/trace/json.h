@@ -17,5 +17,10 @@ std::string compactText(const json_t* json);
 
 // Appends a member to an object.
 void addMember(const Json& object, const char* key, Json value);
+// Appends an element to an array.
+void appendElement(const Json& array, Json value);
+
+// A string. JSON cannot hold what is not UTF-8: if a text has such bytes, all beyond ASCII are shown as their numbers.
+Json textJson(const std::string& text);
 
 }  // namespace senseloom::tool

@@ -1,0 +1,30 @@
+#include "view/view.h"
+
+#include <memory>
+#include <utility>
+
+#include "explain/log_capture.h"
+#include "plot/replay_plot.h"
+#include "replay/replay_progress.h"
+#include "terminal/output_sink.h"
+#include "trace/replayer.h"
+#include "trace/trace_reader.h"
+#include "view/page.h"
+#include "view/page_data.h"
+
+namespace senseloom::tool {
+
+void view(std::FILE* out, const ViewArguments& arguments) {
+  TraceReader trace(arguments.trace);
+  OutputSink sink(out, arguments.page, arguments.trace);
+  LogCapture log;
+  auto data = std::make_unique<PageData>(log);
+  const PageData& gathered = *data;
+  const auto output = withProgress(std::move(data), trace, out, false);
+  Replayer(*output).replay(trace);
+  writePage(sink, gathered,
+            {.title = traceTitle(arguments.trace), .timeUnit = trace.timeUnit(), .classNames = arguments.classNames});
+  sink.commit();
+}
+
+}  // namespace senseloom::tool

@@ -1,0 +1,20 @@
+#pragma once
+
+#include <cstdio>
+#include <string>
+#include <vector>
+
+namespace senseloom::tool {
+
+// What the user says about a page.
+struct ViewArguments {
+  std::string trace;
+  std::string page = {};                     // its file; empty: standard output
+  std::vector<std::string> classNames = {};  // from class 0 on
+};
+
+// Replays a trace and writes the page of it, to `out` if no file is given. Throws InputError as TraceReader and
+// Replayer do, or when the page would replace the trace, and std::runtime_error if the file cannot be written.
+void view(std::FILE* out, const ViewArguments& arguments);
+
+}  // namespace senseloom::tool
