@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
+#include <fstream>
 #include <string>
 
 #include "recording.h"
@@ -125,6 +126,83 @@ TEST(Convert, NamesTheLineOfBadInput) {
   EXPECT_EQ(errorOf("time,class\n", {"--time-unit", "h"}),
             "senseloom: unknown time unit \"h\": s, ms, us and ns are known\n");
   EXPECT_EQ(runTool({"convert", "--from", "csv", "none.csv"}).err, "senseloom: none.csv: No such file or directory\n");
+}
+
+constexpr char kTaps[] = R"({"note":"","timeUnit":"us"}
+{"call":"open","session":"a, \"b\"","sensor":"STAP"}
+{"call":"set_option","session":"a, \"b\"","option":{"classMask":1}}
+{"call":"dispatch","sensor":"STAP","record":{"timestamp":1500000,"classes":3}}
+{"call":"dispatch","sensor":"STAP","record":{"timestamp":2000000,"classes":2}}
+{"call":"close","session":"a, \"b\""}
+)";
+
+TEST(ConvertToCsv, HasARowPerCallAndSession) {
+  const ToolRun run = runTool({"convert", "--to", "csv", "-"}, kTaps);
+  EXPECT_EQ(run.err, "");
+  EXPECT_EQ(run.out,
+            "line,call,session,sensor,returned,option,properties,timestamp,seconds,value,items,classes,fate,why,"
+            "result_timestamp,result_value,result_items,result_classes\n"
+            "2,open,\"a, \"\"b\"\"\",STAP,handle,,,,,,,,,,,,,\n"
+            "3,set_option,\"a, \"\"b\"\"\",STAP,0,\"{\"\"classMask\"\":1}\",101=1 102=0,,,,,,,,,,,\n"
+            "4,dispatch,\"a, \"\"b\"\"\",STAP,1,,,1500000,1.5,3,,,delivered,delivered,1500000,3,,\n"
+            "5,dispatch,\"a, \"\"b\"\"\",STAP,0,,,2000000,2,2,,,class not wanted,"
+            "\"class not wanted: bits 2, mask 1\",,,,\n"
+            "6,close,\"a, \"\"b\"\"\",STAP,0,,,,,,,,,,,,,\n");
+}
+
+TEST(ConvertToPerfetto, HasAProcessForTheSensorAndATrackForTheSession) {
+  const ToolRun run = runTool({"convert", "--to", "perfetto", "-"}, kTaps);
+  EXPECT_EQ(run.err, "");
+  const std::string head = R"({"displayTimeUnit":"ms","traceEvents":[
+{"name":"process_name","ph":"M","pid":1,"tid":1,"args":{"name":"STAP tapping"}},
+{"name":"thread_name","ph":"M","pid":1,"tid":1,"args":{"name":"records"}},
+{"name":"thread_name","ph":"M","pid":1,"tid":2,"args":{"name":"a, \"b\""}},
+)";
+  EXPECT_EQ(run.out.substr(0, head.size()), head);
+  for (const char* event : {
+           R"("name":"a, \"b\" sets {\"classMask\":1}","cat":"negotiation","ph":"i","ts":1500000.0,"pid":1,"tid":2})",
+           R"({"s":"t","name":"class 1 + 2","cat":"record","ph":"i","ts":1500000.0,"pid":1,"tid":1})",
+           R"({"s":"t","name":"class 1 + 2","cat":"result","ph":"i","ts":1500000.0,"pid":1,"tid":2})",
+           R"({"s":"t","name":"class 2","cat":"record","ph":"i","ts":2000000.0,"pid":1,"tid":1})",
+           R"({"dur":500000.0,"name":"open","cat":"session","ph":"X","ts":1500000.0,"pid":1,"tid":2})",
+       }) {
+    EXPECT_NE(run.out.find(event), std::string::npos) << event << " in " << run.out;
+  }
+}
+
+TEST(ConvertToPerfetto, CountsTheItemsInABatch) {
+  const ToolRun run = runTool({"convert", "--to", "perfetto", "-"}, R"({"call":"open","session":"a","sensor":"PHYAC"}
+{"call":"set_option","session":"a","option":{"logN":1}}
+{"call":"dispatch","sensor":"PHYAC","record":{"timestamp":1,"items":[{"class":3,"seq":0}]}}
+{"call":"dispatch","sensor":"PHYAC","record":{"timestamp":2,"items":[{"class":3,"seq":1}]}}
+{"call":"dispatch","session":"a","record":{"hex":"00"}}
+)");
+  const std::string rest = R"(,"name":"batch of a","cat":"batch","ph":"C","ts":)";
+  EXPECT_NE(run.out.find(R"({"args":{"items":1})" + rest + "1000.0,"), std::string::npos) << run.out;
+  EXPECT_NE(run.out.find(R"({"args":{"items":0})" + rest + "2000.0,"), std::string::npos) << run.out;
+  EXPECT_NE(run.out.find(R"("cat":"refused","ph":"i","ts":2000.0)"), std::string::npos) << run.out;
+}
+
+TEST(ConvertTrace, WritesAFile) {
+  const ScratchFile file("converted");
+  EXPECT_EQ(runTool({"convert", "--to", "csv", "-o", file.name, "lift.jsonl"}).out, "");
+  EXPECT_EQ(contentOf(file.name), runTool({"convert", "--to", "csv", "lift.jsonl"}).out);
+}
+
+TEST(ConvertTrace, NeverReplacesTheTrace) {
+  const ScratchFile file("trace");
+  std::ofstream(file.name) << kTaps;
+  const ToolRun run = runTool({"convert", "--to", "csv", "-o", file.name, file.name});
+  EXPECT_EQ(run.err, "senseloom: " + file.name + ": is the input, which would be lost\n");
+  EXPECT_EQ(run.status, 2);
+  EXPECT_EQ(contentOf(file.name), kTaps);
+}
+
+TEST(ConvertErrors, SayWhichWayToConvert) {
+  EXPECT_EQ(runTool({"convert", "lift.jsonl"}).err, "senseloom: --from or --to says what to convert FILE from or to\n");
+  EXPECT_EQ(runTool({"convert", "--from", "csv", "--to", "csv", "lift.jsonl"}).status, 2);
+  EXPECT_EQ(runTool({"convert", "--to", "csv", "--columns", "time=t", "lift.jsonl"}).status, 2);
+  EXPECT_EQ(runTool({"convert", "--to", "csv", "-"}, "stop\n").status, 2);
 }
 
 }  // namespace
