@@ -154,6 +154,15 @@ TEST_P(CompressedRecording, LeavesAnUnfinishedOneAlone) {
   EXPECT_EQ(contentOf(file + ".part"), "mine\n");
 }
 
+TEST_P(CompressedRecording, IsWholeWhenTheProgramWasKilled) {
+  const ScratchFolder folder("compressed_killed");
+  const std::string file = folder.file("trace.jsonl." + GetParam());
+  EXPECT_EQ(recordDriven(file, "open a LIFT\nrepeat a 1000\nsignal 9\n").status, -1);
+  const ToolRun checked = check(file);
+  EXPECT_EQ(checked.out, "1001 calls compared, all as recorded\n");
+  EXPECT_NE(checked.err.find(":1003: the program was ended by a signal: Killed\n"), std::string::npos) << checked.err;
+}
+
 TEST_P(CompressedRecording, TellsThatItWasCutShort) {
   const ScratchFolder folder("compressed_cut");
   const std::string file = folder.file("trace.jsonl." + GetParam());
@@ -198,6 +207,19 @@ TEST(RecordFiles, WritesToANamedPipe) {
   EXPECT_EQ(callsOf(content), R"({"call":"open","session":"s1","sensor":"LIFT","returned":"handle"}
 {"call":"close","session":"s1","returned":0}
 )");
+}
+
+// The program goes on when nobody reads its recording any more.
+TEST(RecordFiles, LeavesTheProgramAloneWhenThePipeIsClosed) {
+  const ScratchFile errors("closed_pipe");
+  const std::string record =
+      "{ '" TOOL_FILE "' record -o - -- '" DRIVEN_FILE "' 2>'" + errors.name + "'; echo $? >&2; }";
+  BackgroundProgram tool({"/bin/sh", "-c", record + " | head -n 1"}, recordingEnvironment());
+  tool.tell("open a LIFT");
+  EXPECT_EQ(tool.readLine().rfind(R"({"format":1,)", 0), 0U);
+  tool.tell("repeat a 10000\ndispatch a 5");
+  EXPECT_EQ(tool.finish().err, "1\n");
+  EXPECT_EQ(contentOf(errors.name), "1\n10000\n1\nsenseloom: the recording cannot be written: Broken pipe\n");
 }
 
 TEST(RecordFiles, RefusesThePipeOfARecordingThatGoesOn) {

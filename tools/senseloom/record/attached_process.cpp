@@ -1,5 +1,6 @@
 #include "record/attached_process.h"
 
+#include <csignal>
 #include <string>
 
 #include "exit_status.h"
@@ -39,7 +40,9 @@ void recordAttached(std::FILE* out, const RecordingArguments& arguments, pid_t p
   const std::string answer = waitForAnswer(control, recording, title, -1);
   if (answer.compare(0, 3, "no:") == 0) throw InputError(title + " cannot be recorded:" + answer.substr(3));
   if (answer.empty()) control.takeBack();
-  while (!answer.empty() && control.isAlive() && control.isRecording() && !isInterrupted()) recording.passOn();
+  std::signal(SIGPIPE, SIG_IGN);  // the process has to be told to stop when nobody reads the recording
+  const auto goesOn = [&] { return control.isAlive() && control.isRecording() && !recording.isBroken(); };
+  while (!answer.empty() && goesOn() && !isInterrupted()) recording.passOn();
 
   std::string cause;
   if (!control.isAlive()) {

@@ -2,6 +2,8 @@
 
 #include <unistd.h>
 
+#include <csignal>
+
 #include "record/child_program.h"
 #include "record/program_file.h"
 #include "record/recorder_files.h"
@@ -14,6 +16,7 @@ void runRecorded(std::FILE* out, const RecordingArguments& arguments, const std:
   const bool isOnOutput = arguments.file == "-";
   Recording recording(arguments, fileno(out));
   ChildProgram program(command, recording.order().text(), audit, isOnOutput ? STDERR_FILENO : fileno(out));
+  std::signal(SIGPIPE, SIG_IGN);  // the program goes on when nobody reads the recording
   while (!program.hasEnded()) recording.passOn();
   // Processes that it left behind may still write.
   const InterruptMark mark;

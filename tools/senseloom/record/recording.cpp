@@ -120,13 +120,23 @@ bool Recording::passOn() {
     poll(nullptr, 0, kPatience);
     return false;
   }
+  try {
+    return readPipe();
+  } catch (const std::runtime_error& error) {
+    trouble = error.what();
+    return true;
+  }
+}
+
+bool Recording::readPipe() {
   pollfd waiting{.fd = readEnd, .events = POLLIN, .revents = 0};
   const int ready = poll(&waiting, 1, kPatience);
-  if (ready == 0) output->flush();
+  if (ready == 0 && !isBroken()) output->flush();
   if (ready <= 0) return true;
   std::string lines(kChunk, '\0');
   const ssize_t count = read(readEnd, lines.data(), lines.size());
   if (count <= 0) return count < 0 && errno == EINTR;
+  if (isBroken()) return true;
   lines.resize(static_cast<size_t>(count));
   rest += lines;
   const size_t end = rest.rfind('\n') + 1;
@@ -167,6 +177,7 @@ void Recording::nextPart() {
 
 void Recording::complete(const std::string& cause) {
   const UnfinishedEnd end = summary.unfinished(cause);
+  if (isBroken()) throw std::runtime_error(trouble);
   if (isPiped) {
     if (hasHead && !hasEnd) output->write(endLine(calls, end));
     if (hasHead) output->finish();

@@ -39,8 +39,11 @@ class Recording {
   // any more: nothing passes through the tool or, once no other writer is expected, nobody writes to the pipe.
   bool passOn();
   void expectNoOtherWriter();
+  // Whether what comes is thrown away, because it cannot be written. The process is not to wait for that.
+  bool isBroken() const { return !trouble.empty(); }
 
   // Completes the files, and what a process left without its end; `cause` is why, if it did not come to its own end.
+  // Throws std::runtime_error when the lines that passed through the tool could not all be written.
   void complete(const std::string& cause);
 
   const SummaryReport& report() const { return summary; }
@@ -49,6 +52,7 @@ class Recording {
   void checkFile() const;
   void checkPipe() const;
   void openPipe(int out);
+  bool readPipe();
   void passLines(std::string_view lines);
   void nextPart();
 
@@ -60,7 +64,8 @@ class Recording {
   int readEnd = -1;
   int writeEnd = -1;
   std::unique_ptr<LineOutput> output;
-  std::string rest;  // of a line that has not come whole
+  std::string rest;     // of a line that has not come whole
+  std::string trouble;  // why lines cannot be written; empty: they can
   uint64_t calls = 0;
   bool hasHead = false;
   bool hasEnd = false;
