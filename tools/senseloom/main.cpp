@@ -17,10 +17,12 @@
 #include "command_line/argument_error.h"
 #include "command_line/completion.h"
 #include "command_line/help_format.h"
+#include "compare/diff_command.h"
 #include "convert/convert_command.h"
 #include "exit_status.h"
 #include "explain/explain_arguments.h"
 #include "generate/generate_command.h"
+#include "info/info_command.h"
 #include "input_error.h"
 #include "record/record_command.h"
 #include "replay/replay_command.h"
@@ -28,13 +30,15 @@
 #include "status/status_command.h"
 #include "sweep/sweep_command.h"
 #include "terminal/interrupt.h"
+#include "trim/trim_command.h"
 #include "view/view_command.h"
 
 namespace senseloom::tool {
 namespace {
 
 // In the order of the help.
-constexpr Declare* kCommands[] = {declareReplay, declareExplain,  declareView,    declareRecord, declareStatus,
+constexpr Declare* kCommands[] = {declareReplay, declareExplain,  declareView,    declareRecord,
+                                  declareStatus, declareInfo,     declareDiff,    declareTrim,
                                   declareSweep,  declareGenerate, declareConvert, declareSensors};
 
 constexpr int kFailure = 1;

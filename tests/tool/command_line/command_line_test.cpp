@@ -37,7 +37,6 @@ TEST(CommandLine, RefusesWhatItDoesNotUnderstandWithStatus2) {
       {"replay", "--all", "--quiet", "lift.jsonl"},
       {"replay", "--all", "--json", "lift.jsonl"},
       {"replay", "--check", "--all", "lift.jsonl"},
-      {"replay", "--check", "--json", "lift.jsonl"},
       {"replay", "--check", "--quiet", "lift.jsonl"},
       {"replay", "--log", "loud", "lift.jsonl"},
       {"record"},
@@ -95,9 +94,19 @@ TEST(CommandLine, SaysWhichNumbersCanBeGiven) {
 }
 
 TEST(CommandLine, HelpsInAtMost80Columns) {
-  const std::vector<std::vector<std::string>> commands = {
-      {},          {"replay"}, {"explain"}, {"record"}, {"status"}, {"sweep"}, {"generate"}, {"generate", "commute"},
-      {"convert"}, {"sensors"}};
+  const std::vector<std::vector<std::string>> commands = {{},
+                                                          {"replay"},
+                                                          {"explain"},
+                                                          {"record"},
+                                                          {"status"},
+                                                          {"info"},
+                                                          {"diff"},
+                                                          {"trim"},
+                                                          {"sweep"},
+                                                          {"generate"},
+                                                          {"generate", "commute"},
+                                                          {"convert"},
+                                                          {"sensors"}};
   for (std::vector<std::string> command : commands) {
     command.emplace_back("--help");
     std::istringstream lines(runTool(command).out);

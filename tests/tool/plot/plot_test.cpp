@@ -5,7 +5,7 @@
 #include <fstream>
 #include <string>
 
-#include "run_tool.h"
+#include "recording.h"
 
 namespace senseloom::tool {
 namespace {
@@ -137,8 +137,15 @@ TEST(PlotErrors, NameAFileThatCannotBeWritten) {
   }
 }
 
-TEST(PlotErrors, ClassNamesNeedAPlot) {
-  EXPECT_EQ(runTool({"replay", "--class-names", "a,b", "lift.jsonl"}).status, 2);
+TEST(Plot, HasTheNamesOfClassesThatTheTraceHas) {
+  const ScratchFile picture("named_classes");
+  EXPECT_EQ(runTool({"replay", "-", "--plot", picture.name}, R"({"note":"classes","classNames":["none","raised"]}
+{"call":"open","session":"a","sensor":"LIFT"}
+{"call":"dispatch","session":"a","record":{"timestamp":1,"class":1}}
+)")
+                .status,
+            0);
+  EXPECT_NE(contentOf(picture.name).find(">raised<"), std::string::npos);
 }
 
 }  // namespace

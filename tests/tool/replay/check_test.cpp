@@ -27,7 +27,7 @@ void expectDifference(const std::string& piece, const std::string& replacement, 
   std::string tampered = kRecording;
   tampered.replace(tampered.find(piece), piece.size(), replacement);
   const ToolRun run = checkText(tampered);
-  EXPECT_EQ(run.out, "standard input:" + difference);
+  EXPECT_EQ(run.out, "standard input:" + difference + "  this is the first difference: what follows may come of it\n");
   EXPECT_EQ(run.err, "senseloom: 1 of 6 calls compared differ\n");
   EXPECT_EQ(run.status, 1);
 }
@@ -42,62 +42,103 @@ TEST(ReplayCheck, AgreesWithARecording) {
 TEST(ReplayCheck, ShowsAnotherReturnValue) {
   expectDifference(R"("returned":-1)", R"("returned":0)",
                    "6: set_option of session \"s1\" differs from the recording\n"
-                   "  expected: {\"returned\":0}\n"
-                   "  actual:   {\"returned\":-1}\n");
+                   "  what      recorded  now\n"
+                   "  returned  0         -1\n");
   expectDifference(R"("returned":"handle")", R"("returned":null)",
                    "1: open of session \"s1\" differs from the recording\n"
-                   "  expected: {\"returned\":null}\n"
-                   "  actual:   {\"returned\":\"handle\"}\n");
+                   "  what      recorded  now\n"
+                   "  returned  null      handle\n");
 }
 
-TEST(ReplayCheck, ShowsAnotherProperty) {
-  expectDifference(
-      R"("value":"02000000")", R"("value":"03000000")",
-      "2: set_option of session \"s1\" differs from the recording\n"
-      R"(  expected: {"returned":0,"properties":[{"id":101,"size":4,"value":"03000000"},{"id":102,"size":4,"value":"00000000"}]})"
-      "\n"
-      R"(  actual:   {"returned":0,"properties":[{"id":101,"size":4,"value":"02000000"},{"id":102,"size":4,"value":"00000000"}]})"
-      "\n");
+TEST(ReplayCheck, ShowsAnotherPropertyByItsName) {
+  expectDifference(R"("value":"02000000")", R"("value":"03000000")",
+                   "2: set_option of session \"s1\" differs from the recording\n"
+                   "  what           recorded  now\n"
+                   "  101 classMask  3         2\n");
 }
 
 TEST(ReplayCheck, ShowsWhatIsMissingAndWhatIsTooMuch) {
   expectDifference(R"("returned":0})", R"("returned":0,"properties":[]})",
                    "5: dispatch of session \"s1\" differs from the recording\n"
-                   "  expected: {\"returned\":0,\"properties\":[]}\n"
-                   "  actual:   {\"returned\":0}\n");
+                   "  what           recorded      now\n"
+                   "  property list  0 properties  none\n");
+  expectDifference(R"(,{"id":102,"size":4,"value":"00000000"})", "",
+                   "2: set_option of session \"s1\" differs from the recording\n"
+                   "  what       recorded  now\n"
+                   "  102 level  none      0\n");
   expectDifference(R"(,"result":{"hex":"01000000000000000200"})", "",
                    "4: dispatch of session \"s1\" differs from the recording\n"
-                   "  expected: {\"returned\":1}\n"
-                   R"(  actual:   {"returned":1,"result":{"hex":"01000000000000000200"}})"
-                   "\n");
+                   "  what    recorded  now\n"
+                   "  result  none      {\"timestamp\":1,\"classes\":2}\n");
 }
 
-TEST(ReplayCheck, ShowsAnotherResult) {
+TEST(ReplayCheck, ShowsTheFieldOfAResultThatDiffers) {
   expectDifference(R"("result":{"hex":"01)", R"("result":{"hex":"03)",
                    "4: dispatch of session \"s1\" differs from the recording\n"
-                   R"(  expected: {"returned":1,"result":{"hex":"03000000000000000200"}})"
-                   "\n"
-                   R"(  actual:   {"returned":1,"result":{"hex":"01000000000000000200"}})"
-                   "\n");
+                   "  what       recorded  now\n"
+                   "  timestamp  3         1\n");
 }
 
-TEST(ReplayCheck, ShowsEveryDifference) {
-  const ScratchFile trace("differences");
-  std::ofstream(trace.name) << R"({"call":"open","session":"a","sensor":"LIFT","returned":null}
+TEST(ReplayCheck, ShowsTheItemsOfAResultThatDiffer) {
+  const ToolRun run = checkText(R"({"call":"open","session":"a","sensor":"PHYAC","returned":"handle"}
+{"call":"dispatch","session":"a","record":{"hex":"0100000000000000020011002200"},"returned":1,"result":{"hex":"0100000000000000020011002300"}}
+)");
+  EXPECT_NE(run.out.find("  what      recorded             now\n"
+                         "  items[1]  {\"class\":3,\"seq\":2}  {\"class\":2,\"seq\":2}\n"),
+            std::string::npos)
+      << run.out;
+}
+
+constexpr char kThreeDifferences[] = R"({"call":"open","session":"a","sensor":"LIFT","returned":null}
 {"call":"open","session":"b","sensor":"LIFT"}
 {"call":"dispatch","sensor":"LIFT","record":{"hex":""},"returned":0}
 )";
-  const ToolRun run = check(trace.name);
+
+TEST(ReplayCheck, ShowsEveryDifferenceAndWhichIsTheFirst) {
+  const ToolRun run = checkText(kThreeDifferences);
   const std::string rest =
-      " differs from the recording\n  expected: {\"returned\":0}\n"
-      "  actual:   {\"returned\":1,\"result\":{\"hex\":\"\"}}\n";
-  EXPECT_EQ(run.out, trace.name +
-                         ":1: open of session \"a\" differs from the recording\n"
-                         "  expected: {\"returned\":null}\n  actual:   {\"returned\":\"handle\"}\n" +
-                         trace.name + ":3: dispatch of session \"a\"" + rest + trace.name +
-                         ":3: dispatch of session \"b\"" + rest);
+      " differs from the recording\n"
+      "  what      recorded  now\n"
+      "  returned  0         1\n"
+      "  result    none      no bytes\n";
+  EXPECT_EQ(run.out,
+            "standard input:1: open of session \"a\" differs from the recording\n"
+            "  what      recorded  now\n"
+            "  returned  null      handle\n"
+            "  this is the first difference: what follows may come of it\n"
+            "standard input:3: dispatch of session \"a\"" +
+                rest + "standard input:3: dispatch of session \"b\"" + rest);
   EXPECT_EQ(run.err, "senseloom: 3 of 3 calls compared differ\n");
   EXPECT_EQ(run.status, 1);
+}
+
+TEST(ReplayCheck, ShowsNoMoreDifferencesThanAreWanted) {
+  const ToolRun run = runTool({"replay", "--check", "--limit", "1", "-"}, kThreeDifferences);
+  EXPECT_NE(run.out.find("may come of it\n2 more calls differ\n"), std::string::npos) << run.out;
+  EXPECT_EQ(run.err, "senseloom: 3 of 3 calls compared differ\n");
+}
+
+TEST(ReplayCheck, PrintsJson) {
+  const ToolRun run = runTool({"replay", "--check", "--json", "--limit", "1", "-"}, kThreeDifferences);
+  EXPECT_EQ(run.out, R"({"line":1,"call":"open","session":"a","isFirst":true,)"
+                     R"("differences":[{"what":"returned","recorded":"null","now":"handle"}]})"
+                     "\n");
+  EXPECT_EQ(run.status, 1);
+  EXPECT_EQ(runTool({"replay", "--check", "--json", "-"}, kRecording).out, "");
+}
+
+TEST(ReplayCheck, SaysThatARecordingDoesNotHoldWhatTheGestureEngineAnswered) {
+  const std::string record =
+      "01000000000000000000"
+      "0c00" +
+      std::string(24, '0');
+  const ToolRun run = checkText(R"({"call":"open","session":"a","sensor":"GSPX","returned":"handle"}
+{"call":"dispatch","session":"a","record":{"hex":")" +
+                                record + R"("},"returned":1,"result":{"hex":"0100000000000000050000000000000000000000"}}
+)");
+  EXPECT_NE(run.out.find("  the recording does not hold what the platform's gesture engine answered\n"),
+            std::string::npos)
+      << run.out;
 }
 
 TEST(ReplayCheck, CountsCallsWithoutARecordedResult) {

@@ -87,14 +87,13 @@ TEST(ReplayErrors, ClosesWhatTheTraceOpened) {
 stop
 )");
   EXPECT_EQ(run.err.rfind("deactivating aware session...\nsenseloom: standard input:5: not JSON: ", 0), 0U) << run.err;
-  EXPECT_EQ(
-      run.out,
-      kHeading +
-          "     1  open        a         LPE_P   handle\n"
-          "     2  open        b         LPE_P   handle\n"
-          "     3  open        c         PHYAC   handle\n"
-          "     4  set_option  c         PHYAC   0       41 mode=0, 43 spans=65537 (1, 1), 44 decisionsPerSpan=1, "
-          "42 classMask=-1\n");
+  EXPECT_EQ(run.out, kHeading +
+                         "     1  open        a         LPE_P   handle\n"
+                         "     2  open        b         LPE_P   handle\n"
+                         "     3  open        c         PHYAC   handle\n"
+                         "     4  set_option  c         PHYAC   0       {} -> 41 mode=0, 43 spans=65537 (1, 1), 44 "
+                         "decisionsPerSpan=1, "
+                         "42 classMask=-1\n");
   EXPECT_EQ(run.status, 2);
 }
 

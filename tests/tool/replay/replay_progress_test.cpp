@@ -50,10 +50,10 @@ std::string runOnTerminal(std::vector<std::string> arguments, bool withOutput) {
   return text;
 }
 
-// A trace of a few calls, and of `noteBytes` bytes for readers.
-void writeTrace(const std::string& file, size_t noteBytes) {
-  std::ofstream(file) << R"({"call":"open","session":"a","sensor":"LIFT"})"
-                      << "\n{\"note\":\"" << std::string(noteBytes, '.') << "\"}\n"
+// A trace of a few calls, and of so many blanks.
+void writeTrace(const std::string& file, size_t blanks) {
+  std::ofstream(file) << R"({"call":"open","session":"a","sensor":"LIFT"})" << '\n'
+                      << std::string(blanks, ' ') << '\n'
                       << R"({"call":"close","session":"a","returned":0})" << '\n';
 }
 

@@ -25,35 +25,37 @@ constexpr char kTwoClients[] = R"({"call":"open","session":"lock","sensor":"STAP
 
 TEST(ReplayTable, ShowsCallsAndWhatEachClientReceives) {
   const ToolRun run = runTool({"replay", "-"}, kTwoClients);
-  EXPECT_EQ(run.out,
-            "  line  call        session   sensor  return  outcome\n"
-            "     1  open        lock      STAP    handle\n"
-            "     2  open        camera    STAP    handle\n"
-            "     3  set_option  camera    STAP    0       101 classMask=3, 102 level=-1\n"
-            "     4  dispatch    lock      STAP    1       timestamp=81 classes=1\n"
-            "     7  dispatch    camera    STAP    1       timestamp=83 classes=3\n"
-            "     8  set_option  lock      STAP    -1      failed\n"
-            "     9  close       lock      STAP    1       101 classMask=2, 102 level=-1\n"
-            "    10  close       camera    STAP    0\n");
+  EXPECT_EQ(
+      run.out,
+      "  line  call        session   sensor  return  outcome\n"
+      "     1  open        lock      STAP    handle\n"
+      "     2  open        camera    STAP    handle\n"
+      "     3  set_option  camera    STAP    0       {\"classMask\":2,\"level\":-1} -> 101 classMask=3, 102 level=-1\n"
+      "     4  dispatch    lock      STAP    1       timestamp=81 classes=1 -> the record\n"
+      "     7  dispatch    camera    STAP    1       timestamp=83 classes=3 -> the record\n"
+      "     8  set_option  lock      STAP    -1      { -> failed\n"
+      "     9  close       lock      STAP    1       101 classMask=2, 102 level=-1\n"
+      "    10  close       camera    STAP    0\n");
   EXPECT_EQ(run.err, "");
   EXPECT_EQ(run.status, 0);
 }
 
 TEST(ReplayTable, ShowsRecordsThatDeliveredNothingOnDemand) {
   const ToolRun run = runTool({"replay", "--all", "-"}, kTwoClients);
-  EXPECT_EQ(run.out,
-            "  line  call        session   sensor  return  outcome\n"
-            "     1  open        lock      STAP    handle\n"
-            "     2  open        camera    STAP    handle\n"
-            "     3  set_option  camera    STAP    0       101 classMask=3, 102 level=-1\n"
-            "     4  dispatch    lock      STAP    1       timestamp=81 classes=1\n"
-            "     4  dispatch    camera    STAP    0\n"
-            "     5  dispatch    lock      STAP    0\n"
-            "     5  dispatch    camera    STAP    0\n"
-            "     7  dispatch    camera    STAP    1       timestamp=83 classes=3\n"
-            "     8  set_option  lock      STAP    -1      failed\n"
-            "     9  close       lock      STAP    1       101 classMask=2, 102 level=-1\n"
-            "    10  close       camera    STAP    0\n");
+  EXPECT_EQ(
+      run.out,
+      "  line  call        session   sensor  return  outcome\n"
+      "     1  open        lock      STAP    handle\n"
+      "     2  open        camera    STAP    handle\n"
+      "     3  set_option  camera    STAP    0       {\"classMask\":2,\"level\":-1} -> 101 classMask=3, 102 level=-1\n"
+      "     4  dispatch    lock      STAP    1       timestamp=81 classes=1 -> the record\n"
+      "     4  dispatch    camera    STAP    0       timestamp=81 classes=1\n"
+      "     5  dispatch    lock      STAP    0       timestamp=82 classes=4\n"
+      "     5  dispatch    camera    STAP    0       timestamp=82 classes=4\n"
+      "     7  dispatch    camera    STAP    1       timestamp=83 classes=3 -> the record\n"
+      "     8  set_option  lock      STAP    -1      { -> failed\n"
+      "     9  close       lock      STAP    1       101 classMask=2, 102 level=-1\n"
+      "    10  close       camera    STAP    0\n");
   EXPECT_EQ(run.status, 0);
 }
 
@@ -88,15 +90,18 @@ TEST(ReplayTable, CutsLongListsAndBytesShort) {
       "  line  call        session   sensor  return  outcome\n"
       "     1  open        a         PHYAC   handle\n"
       "     2  dispatch    a         PHYAC   1       timestamp=1 items=[class=1 seq=1, class=2 seq=2, class=3 seq=3, "
-      "class=4 seq=4]\n"
+      "class=4 seq=4] -> the record\n"
       "     3  dispatch    a         PHYAC   1       timestamp=1 items=[class=1 seq=1, class=2 seq=2, class=3 seq=3, "
-      "class=4 seq=4, ... (5)]\n"
+      "class=4 seq=4, ... (5)] -> the record\n"
       "     4  open        b         PDR     handle\n"
-      "     5  dispatch    b         PDR     1       timestamp=2 items=[00112233445566778899aabbccddeeff...]\n"
+      "     5  dispatch    b         PDR     1       timestamp=2 items=[00112233445566778899aabbccddeeff...] -> the "
+      "record\n"
       "     6  open        c         DTWGS   handle\n"
-      "     7  set_option  c         DTWGS   0       121 level=0, 122 templateNumber=0, 123 "
+      "     7  set_option  c         DTWGS   0       {\"mode\":4,\"classMask\":1,\"template1\":"
+      "\"001000112233445566778899aabbccddeeff\"} -> 121 level=0, 122 templateNumber=0, 123 "
       "templateData=00112233445566778899aabbccddeeff\n"
-      "     8  set_option  c         DTWGS   0       121 level=0, 122 templateNumber=0, 123 "
+      "     8  set_option  c         DTWGS   0       {\"mode\":4,\"classMask\":1,\"template1\":"
+      "\"001100112233445566778899aabbccddeeff00\"} -> 121 level=0, 122 templateNumber=0, 123 "
       "templateData=00112233445566778899aabbccddeeff... (17 bytes)\n"
       "   end  close       a         PHYAC   0\n"
       "   end  close       b         PDR     0\n"
@@ -112,8 +117,8 @@ TEST(ReplayTable, ShowsResultsThatAreNotARecordAsBytes) {
   EXPECT_EQ(run.out,
             "  line  call        session   sensor  return  outcome\n"
             "     1  open        a         LIFT    handle\n"
-            "     2  dispatch    a         LIFT    1       0102ff\n"
-            "     3  dispatch    a         LIFT    1       no bytes\n"
+            "     2  dispatch    a         LIFT    1       0102ff -> the record\n"
+            "     3  dispatch    a         LIFT    1       no bytes -> the record\n"
             "     4  close       a         LIFT    0\n");
 }
 
@@ -129,13 +134,13 @@ TEST(ReplayJson, PrintsOneObjectPerCallAndSession) {
   EXPECT_EQ(run.out,
             R"({"line":1,"call":"open","session":"lock","sensor":"STAP","return":"handle"}
 {"line":2,"call":"open","session":"camera","sensor":"STAP","return":"handle"}
-{"line":3,"call":"set_option","session":"camera","sensor":"STAP","return":0,"properties":[{"id":101,"name":"classMask","value":3},{"id":102,"name":"level","value":-1}]}
-{"line":4,"call":"dispatch","session":"lock","sensor":"STAP","return":1,"result":{"timestamp":81,"classes":1},"hex":"51000000000000000100"}
-{"line":4,"call":"dispatch","session":"camera","sensor":"STAP","return":0,"result":null,"hex":null}
-{"line":5,"call":"dispatch","session":"lock","sensor":"STAP","return":0,"result":null,"hex":null}
-{"line":5,"call":"dispatch","session":"camera","sensor":"STAP","return":0,"result":null,"hex":null}
-{"line":7,"call":"dispatch","session":"camera","sensor":"STAP","return":1,"result":{"timestamp":83,"classes":3},"hex":"53000000000000000300"}
-{"line":8,"call":"set_option","session":"lock","sensor":"STAP","return":-1,"properties":null}
+{"line":3,"call":"set_option","session":"camera","sensor":"STAP","return":0,"option":"{\"classMask\":2,\"level\":-1}","properties":[{"id":101,"name":"classMask","value":3},{"id":102,"name":"level","value":-1}]}
+{"line":4,"call":"dispatch","session":"lock","sensor":"STAP","return":1,"record":{"timestamp":81,"classes":1},"recordHex":"51000000000000000100","result":{"timestamp":81,"classes":1},"hex":"51000000000000000100"}
+{"line":4,"call":"dispatch","session":"camera","sensor":"STAP","return":0,"record":{"timestamp":81,"classes":1},"recordHex":"51000000000000000100","result":null,"hex":null}
+{"line":5,"call":"dispatch","session":"lock","sensor":"STAP","return":0,"record":{"timestamp":82,"classes":4},"recordHex":"52000000000000000400","result":null,"hex":null}
+{"line":5,"call":"dispatch","session":"camera","sensor":"STAP","return":0,"record":{"timestamp":82,"classes":4},"recordHex":"52000000000000000400","result":null,"hex":null}
+{"line":7,"call":"dispatch","session":"camera","sensor":"STAP","return":1,"record":{"timestamp":83,"classes":3},"recordHex":"53000000000000000300","result":{"timestamp":83,"classes":3},"hex":"53000000000000000300"}
+{"line":8,"call":"set_option","session":"lock","sensor":"STAP","return":-1,"option":"{","properties":null}
 {"line":9,"call":"close","session":"lock","sensor":"STAP","return":1,"properties":[{"id":101,"name":"classMask","value":2},{"id":102,"name":"level","value":-1}]}
 {"line":10,"call":"close","session":"camera","sensor":"STAP","return":0,"properties":null}
 )");
@@ -151,7 +156,7 @@ TEST(ReplayJson, HasNullForTheLineOfAClosingAtTheEndAndNoSessionForUninit) {
   EXPECT_EQ(run.out,
             R"({"line":1,"call":"uninit"}
 {"line":2,"call":"open","session":"a","sensor":"GSPX","return":"handle"}
-{"line":3,"call":"set_option","session":"a","sensor":"GSPX","return":0,"properties":[]}
+{"line":3,"call":"set_option","session":"a","sensor":"GSPX","return":0,"option":"{}","properties":[]}
 {"line":null,"call":"close","session":"a","sensor":"GSPX","return":0,"properties":null}
 )");
 }
@@ -161,10 +166,13 @@ TEST(ReplayJson, HoldsTemplateBytesWhole) {
   const ToolRun run = runTool({"replay", "--json", "-"}, R"({"call":"open","session":"a","sensor":"DTWGS"}
 {"call":"set_option","session":"a","option":{"mode":4,"classMask":2,"level":1,"template2":"0384)" +
                                                              data + "\"}}\n");
-  EXPECT_EQ(run.out,
-            R"({"line":1,"call":"open","session":"a","sensor":"DTWGS","return":"handle"}
-{"line":2,"call":"set_option","session":"a","sensor":"DTWGS","return":0,"properties":[{"id":121,"name":"level","value":1},{"id":122,"name":"templateNumber","value":1},{"id":123,"name":"templateData","hex":")" +
-                data + R"("}]}
+  EXPECT_EQ(
+      run.out,
+      R"({"line":1,"call":"open","session":"a","sensor":"DTWGS","return":"handle"}
+{"line":2,"call":"set_option","session":"a","sensor":"DTWGS","return":0,"option":"{\"mode\":4,\"classMask\":2,\"level\":1,\"template2\":\"0384)" +
+          data +
+          R"(\"}","properties":[{"id":121,"name":"level","value":1},{"id":122,"name":"templateNumber","value":1},{"id":123,"name":"templateData","hex":")" +
+          data + R"("}]}
 {"line":null,"call":"close","session":"a","sensor":"DTWGS","return":0,"properties":null}
 )");
 }
@@ -184,8 +192,8 @@ TEST(ReplayJson, HoldsResultsThatAreNotARecordAsHexAlone) {
 )");
   EXPECT_EQ(run.out,
             R"({"line":1,"call":"open","session":"a","sensor":"LIFT","return":"handle"}
-{"line":2,"call":"dispatch","session":"a","sensor":"LIFT","return":1,"result":null,"hex":"0102ff"}
-{"line":3,"call":"dispatch","session":"a","sensor":"LIFT","return":1,"result":null,"hex":""}
+{"line":2,"call":"dispatch","session":"a","sensor":"LIFT","return":1,"record":null,"recordHex":"0102ff","result":null,"hex":"0102ff"}
+{"line":3,"call":"dispatch","session":"a","sensor":"LIFT","return":1,"record":null,"recordHex":"","result":null,"hex":""}
 {"line":4,"call":"close","session":"a","sensor":"LIFT","return":0,"properties":null}
 )");
 }
@@ -245,9 +253,9 @@ TEST(Replay, DispatchesToTheSessionsOfASensorInOpeningOrder) {
             "     4  open        b         LIFT    handle\n"
             "     5  close       c         LIFT    1       201 classMask=3\n"
             "     6  open        c         LIFT    handle\n"
-            "     7  dispatch    a         LIFT    1       timestamp=1 class=1\n"
-            "     7  dispatch    b         LIFT    1       timestamp=1 class=1\n"
-            "     7  dispatch    c         LIFT    1       timestamp=1 class=1\n"
+            "     7  dispatch    a         LIFT    1       timestamp=1 class=1 -> the record\n"
+            "     7  dispatch    b         LIFT    1       timestamp=1 class=1 -> the record\n"
+            "     7  dispatch    c         LIFT    1       timestamp=1 class=1 -> the record\n"
             "   end  close       a         LIFT    1       201 classMask=3\n"
             "   end  close       x         SHAKI   0\n"
             "   end  close       b         LIFT    1       201 classMask=3\n"
@@ -275,8 +283,8 @@ TEST(Replay, KeepsTheNameOfASessionThatDidNotOpenAndItsCallsFail) {
   EXPECT_EQ(table.out,
             "  line  call        session   sensor  return  outcome\n"
             "     1  open        a         LPE_P   NULL    failed\n"
-            "     2  set_option  a         LPE_P   -1      failed\n"
-            "     3  dispatch    a         LPE_P   -1      failed\n"
+            "     2  set_option  a         LPE_P   -1      {} -> failed\n"
+            "     3  dispatch    a         LPE_P   -1      timestamp=1 class=1 -> failed\n"
             "     5  open        a         LPE_P   NULL    failed\n"
             "     6  close       a         LPE_P   -1      failed\n"
             "     7  open        a         LPE_P   NULL    failed\n");
@@ -313,8 +321,8 @@ TEST(Replay, PassesANullOptionOn) {
   EXPECT_EQ(run.out,
             "  line  call        session   sensor  return  outcome\n"
             "     1  open        a         ISACT   handle\n"
-            "     2  set_option  a         ISACT   0       151 classMask=15\n"
-            "     3  set_option  a         ISACT   -1      failed\n"
+            "     2  set_option  a         ISACT   0       no JSON -> 151 classMask=15\n"
+            "     3  set_option  a         ISACT   -1      NULL -> failed\n"
             "     4  close       a         ISACT   0\n");
 }
 
@@ -330,11 +338,11 @@ TEST(Replay, KeepsFeedingAndClosesSessionsThatWereOpenedBeforeUninit) {
   EXPECT_EQ(run.out,
             "  line  call        session   sensor  return  outcome\n"
             "     1  open        a         STAP    handle\n"
-            "     2  set_option  a         STAP    0       101 classMask=1, 102 level=0\n"
+            "     2  set_option  a         STAP    0       {\"classMask\":1} -> 101 classMask=1, 102 level=0\n"
             "     3  uninit\n"
-            "     4  dispatch    a         STAP    1       timestamp=1 classes=1\n"
+            "     4  dispatch    a         STAP    1       timestamp=1 classes=1 -> the record\n"
             "     5  open        b         STAP    handle\n"
-            "     6  set_option  b         STAP    0       101 classMask=2, 102 level=0\n"
+            "     6  set_option  b         STAP    0       {\"classMask\":2} -> 101 classMask=2, 102 level=0\n"
             "     7  close       b         STAP    0\n"
             "   end  close       a         STAP    0\n");
 }

@@ -5,9 +5,9 @@
 #include <string>
 #include <vector>
 
+#include "command_line/call_options.h"
 #include "explain/explain_command.h"
 #include "kinds/sensor_table.h"
-#include "plot/plot_options.h"
 
 namespace senseloom::tool {
 namespace {
@@ -51,6 +51,8 @@ void declareExplain(CLI::App& app, Action& action) {
       ->excludes(records)
       ->excludes(all);
   command->add_flag("--json", arguments->form.json, "print one JSON object per call");
+  addTimeUnitOption(*command, arguments->form.filter.timeUnit);
+  addFilterOptions(*command, arguments->form.filter);
   addPlotOptions(*command, arguments->plot)->excludes(options);
   command->callback([arguments, options, &action] {
     arguments->options = options->reduced_results();

@@ -7,6 +7,7 @@
 #include "explain/explainer.h"
 #include "explain/explanation_json.h"
 #include "explain/explanation_text.h"
+#include "explain/filtered_explanation.h"
 #include "explain/log_capture.h"
 #include "input_error.h"
 #include "model/nearest_name.h"
@@ -71,9 +72,9 @@ void explainTrace(std::FILE* out, const std::string& file, const ExplanationForm
   const InterruptMark mark;
   TraceReader trace = openTrace(file);
   LogCapture log;
-  const auto output = makeOutput(out, form);
+  const auto output = withFilter(makeOutput(out, form), form.filter, trace);
   auto explainer = std::make_unique<Explainer>(*output, log);
-  const auto observer = withProgress(withPlot(std::move(explainer), file, plot), trace, out, !form.extent.problems);
+  const auto observer = withProgress(withPlot(std::move(explainer), trace, plot), trace, out, !form.extent.problems);
   Replayer(*observer).replay(trace);
 }
 

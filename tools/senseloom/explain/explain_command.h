@@ -6,6 +6,7 @@
 
 #include "explain/explanation.h"
 #include "plot/replay_plot.h"
+#include "trace/call_filter.h"
 
 namespace senseloom::tool {
 
@@ -13,6 +14,7 @@ namespace senseloom::tool {
 struct ExplanationForm {
   ExplanationExtent extent;
   bool json = false;
+  FilterArguments filter = {};  // what is printed; the whole trace is explained
 };
 
 // Opens a session for each option string, "session 1" on, gives it the string, and explains every negotiation. Throws

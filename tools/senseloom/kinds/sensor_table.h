@@ -39,6 +39,7 @@ struct Sensor {
   const char* valueMeans = nullptr;
   const char* itemsMean = nullptr;
   const char* resultValueMeans = nullptr;
+  std::string_view classNames = {};  // a letter each, from class 0 on, where the library itself names its classes
 
   // Its properties: the id of the one whose value is bytes; all others are 32-bit integers.
   int32_t bytesProperty = -1;

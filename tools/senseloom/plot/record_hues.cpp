@@ -4,6 +4,7 @@
 #include <cstdlib>
 #include <optional>
 
+#include "trace/class_names.h"
 #include "trace/record_value.h"
 
 namespace senseloom::tool {
@@ -68,7 +69,7 @@ std::string hueText(const Sensor& sensor, size_t hue, const std::vector<std::str
   if (hue == kPlainHue) return "no class";
   if (hue == kOtherHue) return "other class";
   if (sensor.shown == Shown::classSet) return classSetText(hue);
-  if (hue < names.size()) return names[hue];
+  if (const std::string name = className(sensor, names, static_cast<int64_t>(hue)); !name.empty()) return name;
   const std::string text = "class " + std::to_string(hue);
   return static_cast<int32_t>(hue) == sensor.noMajorityClass ? text + " (no majority)" : text;
 }

@@ -4,8 +4,9 @@
 #include "plot/svg_picture.h"
 
 namespace senseloom::tool {
-ReplayPlot::ReplayPlot(std::unique_ptr<ReplayObserver> replayOutput, std::string plotTitle, PlotArguments plotArguments)
-    : output(std::move(replayOutput)), title(std::move(plotTitle)), arguments(std::move(plotArguments)) {
+ReplayPlot::ReplayPlot(std::unique_ptr<ReplayObserver> replayOutput, const TraceReader& reader,
+                       PlotArguments plotArguments)
+    : output(std::move(replayOutput)), trace(reader), arguments(std::move(plotArguments)) {
   requireWritable(arguments.file);
 }
 
@@ -15,7 +16,7 @@ void ReplayPlot::onOutcome(const CallOutcome& outcome) {
 }
 
 void ReplayPlot::onEnd() {
-  writePicture(arguments.file, drawSvg(plot, title, arguments.classNames));
+  writePicture(arguments.file, drawSvg(plot, traceTitle(trace.fileName()), classNamesOf(arguments.classNames, trace)));
   output->onEnd();
 }
 
@@ -23,10 +24,14 @@ std::string traceTitle(const std::string& trace) {
   return trace == "-" ? "standard input" : trace.substr(trace.rfind('/') + 1);
 }
 
-std::unique_ptr<ReplayObserver> withPlot(std::unique_ptr<ReplayObserver> output, const std::string& trace,
+ClassNames classNamesOf(const std::string& given, const TraceReader& trace) {
+  return given.empty() ? trace.classNames() : readClassNames(given);
+}
+
+std::unique_ptr<ReplayObserver> withPlot(std::unique_ptr<ReplayObserver> output, const TraceReader& trace,
                                          const PlotArguments& arguments) {
   if (arguments.file.empty()) return output;
-  return std::make_unique<ReplayPlot>(std::move(output), traceTitle(trace), arguments);
+  return std::make_unique<ReplayPlot>(std::move(output), trace, arguments);
 }
 
 }  // namespace senseloom::tool

@@ -4,6 +4,7 @@
 #include <string>
 #include <string_view>
 
+#include "compare/call_difference.h"
 #include "trace/json.h"
 #include "trace/trace_line.h"
 
@@ -44,10 +45,28 @@ void CheckOutput::onOutcome(const CallOutcome& outcome) {
   }
   ++compared;
   if (isAsRecorded) return;
-  ++different;
-  std::fprintf(out, "%s: %s of session \"%s\" differs from the recording\n  expected: %s\n  actual:   %s\n",
-               trace.position().c_str(), callName(outcome.call.kind), outcome.session.c_str(),
-               compactText(outcome.call.recorded.get()).c_str(), compactText(actual.get()).c_str());
+  if (++different <= form.most) printDifference(outcome, actual.get());
+}
+
+void CheckOutput::printDifference(const CallOutcome& outcome, const json_t* actual) {
+  const Differences differences = outcomeDifferences(outcome.sensor, outcome.call.recorded.get(), actual);
+  const char* call = callName(outcome.call.kind);
+  if (form.json) {
+    Json object(json_object());
+    addMember(object, "line", Json(json_integer(static_cast<json_int_t>(outcome.call.line))));
+    addMember(object, member::kCall, Json(json_string(call)));
+    addMember(object, member::kSession, Json(json_string(outcome.session.c_str())));
+    addMember(object, "isFirst", Json(json_boolean(different == 1)));
+    addMember(object, "differences", differencesJson("recorded", "now", differences));
+    std::fprintf(out, "%s\n", compactText(object.get()).c_str());
+    return;
+  }
+  std::fprintf(out, "%s: %s of session \"%s\" differs from the recording\n", trace.position().c_str(), call,
+               outcome.session.c_str());
+  printDifferences(out, "recorded", "now", differences);
+  const bool dependsOnEngine = outcome.call.kind == CallKind::dispatch && outcome.sensor->items == Items::samples;
+  if (dependsOnEngine) std::fputs("  the recording does not hold what the platform's gesture engine answered\n", out);
+  if (different == 1) std::fputs("  this is the first difference: what follows may come of it\n", out);
 }
 
 bool CheckOutput::isInMiddle(const CallOutcome& outcome, bool isAsRecorded) {
@@ -63,6 +82,7 @@ bool CheckOutput::isInMiddle(const CallOutcome& outcome, bool isAsRecorded) {
 }
 
 void CheckOutput::onEnd() {
+  if (different > form.most && !form.json) std::fprintf(out, "%zu more calls differ\n", different - form.most);
   std::fflush(out);  // before a message
   if (different != 0) {
     throw std::runtime_error(std::to_string(different) + " of " + std::to_string(compared) + " calls compared differ");
@@ -71,6 +91,7 @@ void CheckOutput::onEnd() {
     throw std::runtime_error("nothing was compared: none of " + std::to_string(unrecorded + inMiddle) +
                              " calls has a recorded result to compare with");
   }
+  if (form.json) return;
   std::fprintf(out, "%zu calls compared, all as recorded", compared);
   if (unrecorded != 0) std::fprintf(out, "; %zu without a recorded result", unrecorded);
   if (inMiddle != 0) std::fprintf(out, "; %zu of sessions in the middle of a batch not compared", inMiddle);

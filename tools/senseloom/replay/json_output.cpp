@@ -11,7 +11,10 @@ namespace senseloom::tool {
 namespace {
 
 Json text(const std::string& value) {
-  return Json(json_string(value.c_str()));
+  return Json(json_stringn(value.data(), value.size()));
+}
+Json orNull(Json value) {
+  return value != nullptr ? std::move(value) : Json(json_null());
 }
 
 Json properties(const CallOutcome& outcome) {
@@ -50,15 +53,28 @@ void JsonOutput::onOutcome(const CallOutcome& outcome) {
     addMember(object, member::kSensor, text(outcome.sensor->name));
     addMember(object, "return", returned(outcome));
   }
+  if (kind == CallKind::setOption) {
+    const auto& option = outcome.call.option;
+    addMember(object, member::kOption, orNull(option ? text(*option) : nullptr));
+  }
   if (kind == CallKind::setOption || kind == CallKind::close) {
     addMember(object, member::kProperties, properties(outcome));
   }
   if (kind == CallKind::dispatch) {
+    addMember(object, member::kRecord, orNull(decodeRecord(*outcome.sensor, outcome.record)));
+    addMember(object, "recordHex", text(toHex(outcome.record)));
     Json fields;
     if (outcome.result) fields = decodeResult(*outcome.sensor, *outcome.result);
-    addMember(object, member::kResult, fields != nullptr ? std::move(fields) : Json(json_null()));
+    addMember(object, member::kResult, orNull(std::move(fields)));
     addMember(object, member::kHex, outcome.result ? text(toHex(*outcome.result)) : Json(json_null()));
   }
+  std::fprintf(out, "%s\n", compactText(object.get()).c_str());
+}
+
+void JsonOutput::onNote(size_t line, const std::string& note) {
+  Json object(json_object());
+  addMember(object, "line", Json(json_integer(static_cast<json_int_t>(line))));
+  addMember(object, member::kNote, text(note));
   std::fprintf(out, "%s\n", compactText(object.get()).c_str());
 }
 

@@ -5,12 +5,14 @@
 #include <CLI/CLI.hpp>
 #include <cstdlib>
 #include <cstring>
+#include <limits>
 #include <map>
 #include <memory>
 #include <string>
+#include <utility>
 
+#include "command_line/call_options.h"
 #include "command_line/option_value.h"
-#include "plot/plot_options.h"
 #include "plot/replay_plot.h"
 #include "replay/check_output.h"
 #include "replay/json_output.h"
@@ -19,6 +21,7 @@
 #include "replay/table_output.h"
 #include "terminal/interrupt.h"
 #include "trace/replayer.h"
+#include "trace/time_unit.h"
 #include "trace/trace_reader.h"
 
 namespace senseloom::tool {
@@ -52,17 +55,26 @@ struct ReplayArguments {
   std::string file;
   bool json = false;
   bool quiet = false;
-  bool all = false;
   bool check = false;
+  size_t most = std::numeric_limits<size_t>::max();
+  TableForm table;
+  std::string times;
+  FilterArguments filter;
   std::string log = defaultLogLevel();
   PlotArguments plot;
 };
 
 std::unique_ptr<ReplayObserver> makeOutput(std::FILE* out, const ReplayArguments& arguments, const TraceReader& trace) {
-  if (arguments.check) return std::make_unique<CheckOutput>(out, trace);
+  if (arguments.check) {
+    return std::make_unique<CheckOutput>(out, CheckForm{.json = arguments.json, .most = arguments.most}, trace);
+  }
   if (arguments.json) return std::make_unique<JsonOutput>(out);
   if (arguments.quiet) return std::make_unique<SummaryOutput>(out);
-  return std::make_unique<TableOutput>(out, arguments.all);
+  TableForm form = arguments.table;
+  if (!arguments.times.empty()) form.times = arguments.times == "clock" ? Times::clock : Times::elapsed;
+  if (!arguments.filter.timeUnit.empty()) form.timeUnit = timeUnitNamed(arguments.filter.timeUnit);
+  if (!arguments.plot.classNames.empty()) form.classNames = readClassNames(arguments.plot.classNames);
+  return std::make_unique<TableOutput>(out, form, trace);
 }
 
 void replay(std::FILE* out, const ReplayArguments& arguments) {
@@ -70,8 +82,8 @@ void replay(std::FILE* out, const ReplayArguments& arguments) {
   TraceReader trace(arguments.file);
   __android_log_set_minimum_priority(kLogLevels.at(arguments.log));
   const bool isFilling = !arguments.quiet && !arguments.check;
-  const auto output =
-      withProgress(withPlot(makeOutput(out, arguments, trace), arguments.file, arguments.plot), trace, out, isFilling);
+  auto shown = withFilter(withPlot(makeOutput(out, arguments, trace), trace, arguments.plot), arguments.filter, trace);
+  const auto output = withProgress(std::move(shown), trace, out, isFilling);
   Replayer(*output).replay(trace);
 }
 
@@ -87,15 +99,22 @@ void declareReplay(CLI::App& app, Action& action) {
   command->add_option("FILE", arguments->file, "the trace; - is standard input")->required()->type_name("FILE");
   auto* json = command->add_flag("--json", arguments->json, "print one JSON object per call and session");
   auto* quiet = command->add_flag("--quiet", arguments->quiet, "print only a summary, one row per client");
-  auto* all = command->add_flag("--all", arguments->all, "print the records that delivered nothing, too");
+  auto* all = command->add_flag("--all", arguments->table.all, "print the records that delivered nothing, too");
   auto* check = command->add_flag("--check", arguments->check, "compare every result with the recorded one");
-  json->excludes(quiet)->excludes(all)->excludes(check);
+  json->excludes(quiet)->excludes(all);
   quiet->excludes(all)->excludes(check);
   check->excludes(all);
   command->add_option("--log", arguments->log, "print log lines from this level on, on standard error")
       ->type_name("LEVEL")
       ->check(oneOf({"debug", "info", "warn", "error", "none"}))
       ->capture_default_str();
+  command->add_flag("--hex", arguments->table.hex, "print records as bytes");
+  command->add_option("--times", arguments->times, "print when calls were made, where the trace tells")
+      ->type_name("TIMES")
+      ->check(oneOf({"elapsed", "clock"}));
+  addLimitOption(*command, arguments->most);
+  addTimeUnitOption(*command, arguments->filter.timeUnit);
+  addFilterOptions(*command, arguments->filter);
   addPlotOptions(*command, arguments->plot);
   command->callback([arguments, &action] { action = [arguments](std::FILE* out) { replay(out, *arguments); }; });
 }

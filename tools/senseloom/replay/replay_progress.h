@@ -18,6 +18,7 @@ class ReplayProgress final : public ReplayObserver {
   ReplayProgress(std::unique_ptr<ReplayObserver> replayOutput, const TraceReader& reader, std::FILE* terminal)
       : output(std::move(replayOutput)), trace(reader), bar(std::in_place, terminal, reader.size()) {}
   void onOutcome(const CallOutcome& outcome) override;
+  void onNote(size_t line, const std::string& text) override { output->onNote(line, text); }
   void onEnd() override;
 
  private:

@@ -44,6 +44,15 @@ void encodeSample(json_t* element, uint8_t* bytes) {
   }
 }
 
+Json decodeSample(const uint8_t* bytes) {
+  Json element(json_array());
+  for (size_t axis = 0; axis < kSampleAxes; ++axis) {
+    const auto value = *recordField<int16_t>({bytes, kSampleSize}, axis * sizeof(int16_t));
+    json_array_append_new(element.get(), json_integer(value));
+  }
+  return element;
+}
+
 void encodeOpaque(json_t* element, uint8_t* bytes) {
   const auto item = json_is_string(element) ? fromHex(json_string_value(element)) : std::nullopt;
   if (!item || item->size() != kOpaqueSize) {
@@ -60,7 +69,7 @@ constexpr size_t kMostCounted = std::numeric_limits<int16_t>::max();
 constexpr ItemCodec kDecisions{member::kItems, kDecisionSize, kMostCounted, encodeDecision, decodeDecision};
 constexpr ItemCodec kOpaque{member::kItems, kOpaqueSize, kMostCounted, encodeOpaque, decodeOpaque};
 constexpr ItemCodec kSamples{member::kSamples, kSampleSize, std::numeric_limits<uint16_t>::max() / kSampleSize,
-                             encodeSample, nullptr};
+                             encodeSample, decodeSample};
 
 }  // namespace
 

@@ -14,7 +14,7 @@ struct ItemCodec {
   size_t size;        // bytes of one item
   size_t most;        // items that a record can count
   void (*encode)(json_t* element, uint8_t* bytes);
-  Json (*decode)(const uint8_t* bytes);  // null: a result does not show them
+  Json (*decode)(const uint8_t* bytes);
 };
 
 // Null for records without items.

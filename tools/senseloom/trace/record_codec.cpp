@@ -10,6 +10,7 @@
 #include "trace/hex.h"
 #include "trace/item_codec.h"
 #include "trace/record_field.h"
+#include "trace/record_value.h"
 #include "trace/trace_form.h"
 
 namespace senseloom::tool {
@@ -61,6 +62,15 @@ Json decodeItems(const ItemCodec& items, int32_t count, std::span<const uint8_t>
   return array;
 }
 
+// The timestamp, and the integer behind it if it has a name; null when the bytes end before.
+Json decodeHead(const Sensor& sensor, std::span<const uint8_t> record, const char* valueName) {
+  if (record.size() < kValueOffset + sensor.valueSize) return nullptr;
+  Json fields(json_object());
+  addMember(fields, member::kTimestamp, decodeTimestamp(*recordField<uint64_t>(record, kTimestampOffset)));
+  if (valueName != nullptr) addMember(fields, valueName, Json(json_integer(*recordValue(sensor, record))));
+  return fields;
+}
+
 }  // namespace
 
 std::vector<uint8_t> encodeRecord(const Sensor& sensor, json_t* record) {
@@ -81,21 +91,24 @@ std::vector<uint8_t> encodeRecord(const Sensor& sensor, json_t* record) {
   return bytes;
 }
 
-Json decodeResult(const Sensor& sensor, std::span<const uint8_t> result) {
-  if (result.size() < kValueOffset + sensor.valueSize) return nullptr;
-  const int32_t value = sensor.valueSize == sizeof(int32_t) ? *recordField<int32_t>(result, kValueOffset)
-                                                            : *recordField<int16_t>(result, kValueOffset);
-  Json fields(json_object());
-  addMember(fields, member::kTimestamp, decodeTimestamp(*recordField<uint64_t>(result, kTimestampOffset)));
-  if (sensor.value != nullptr) {
-    addMember(fields, sensor.resultValue == nullptr ? sensor.value : sensor.resultValue, Json(json_integer(value)));
-    return fields;
-  }
-  const ItemCodec& items = *itemCodec(sensor.items);
-  Json array = decodeItems(items, value, result.subspan(kItemsOffset));
+Json decodeRecord(const Sensor& sensor, std::span<const uint8_t> record) {
+  const ItemCodec* items = itemCodec(sensor.items);
+  Json fields = decodeHead(sensor, record, sensor.value);
+  if (fields == nullptr || items == nullptr) return fields;
+  const size_t lengthOffset = kValueOffset + (sensor.value == nullptr ? 0 : sensor.valueSize);
+  const auto counted = recordField<uint16_t>(record, lengthOffset);
+  if (!counted) return nullptr;
+  const int32_t count =
+      sensor.value == nullptr ? static_cast<int16_t>(*counted) : *counted / static_cast<int32_t>(items->size);
+  Json array = decodeItems(*items, count, record.subspan(lengthOffset + sizeof(uint16_t)));
   if (array == nullptr) return nullptr;
-  addMember(fields, items.field, std::move(array));
+  addMember(fields, items->field, std::move(array));
   return fields;
+}
+
+Json decodeResult(const Sensor& sensor, std::span<const uint8_t> result) {
+  if (sensor.resultValue != nullptr) return decodeHead(sensor, result, sensor.resultValue);
+  return decodeRecord(sensor, result);
 }
 
 }  // namespace senseloom::tool

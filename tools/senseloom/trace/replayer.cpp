@@ -54,6 +54,9 @@ std::optional<int32_t> Property::integer() const {
 }
 
 void Replayer::replay(TraceReader& trace) {
+  trace.listen([this](size_t line, const Json& aside) {
+    if (isNote(aside)) observer.onNote(line, noteText(aside));
+  });
   try {
     while (const auto call = trace.next()) perform(*call);
   } catch (const InputError& error) {

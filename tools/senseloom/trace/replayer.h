@@ -39,6 +39,8 @@ class ReplayObserver {
  public:
   virtual ~ReplayObserver() = default;
   virtual void onOutcome(const CallOutcome& outcome) = 0;
+  // A line of the trace with a note in place of a call.
+  virtual void onNote(size_t /*line*/, const std::string& /*text*/) {}
   // The trace was replayed to its end.
   virtual void onEnd() {}
 };

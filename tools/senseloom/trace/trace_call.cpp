@@ -93,10 +93,20 @@ bool isNote(const Json& object) {
          json_object_get(object.get(), member::kNote) != nullptr;
 }
 
+std::string noteText(const Json& note) {
+  const auto textOf = [&note](const char* key) {
+    const char* text = json_string_value(json_object_get(note.get(), key));
+    return std::string(text == nullptr ? "" : text);
+  };
+  const std::string why = textOf(member::kWhy);
+  return textOf(member::kNote) + (why.empty() ? "" : ": " + why);
+}
+
 TraceCall readCall(const Json& object) {
   TraceCall call;
   call.kind = callMember(object);
   call.recorded = recordedMembers(object);
+  if (const json_t* at = json_object_get(object.get(), member::kAt)) call.atMicroseconds = json_integer_value(at);
   switch (call.kind) {
     case CallKind::open:
       call.session = sessionMember(object);

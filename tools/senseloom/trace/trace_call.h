@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <optional>
 #include <string>
 
@@ -14,17 +15,20 @@ namespace senseloom::tool {
 struct TraceCall {
   size_t line = 0;
   CallKind kind = CallKind::uninit;
-  std::string session;                // empty for uninit, and for a dispatch to a whole sensor
-  const Sensor* sensor = nullptr;     // of an open, and of a dispatch to a whole sensor
-  std::optional<std::string> option;  // of a set_option; nothing: a null pointer
-  Json record;                        // of a dispatch
-  bool isResumed = false;             // an open: the session was open before the recording
-  Json recorded;                      // what a recording says of its outcome; null: nothing
-  Json truth;                         // of a dispatch: the member of that name, whatever it is; null: there is none
+  std::string session;                    // empty for uninit, and for a dispatch to a whole sensor
+  const Sensor* sensor = nullptr;         // of an open, and of a dispatch to a whole sensor
+  std::optional<std::string> option;      // of a set_option; nothing: a null pointer
+  Json record;                            // of a dispatch
+  std::optional<int64_t> atMicroseconds;  // since the recording began
+  bool isResumed = false;                 // an open: the session was open before the recording
+  Json recorded;                          // what a recording says of its outcome; null: nothing
+  Json truth;                             // of a dispatch: the member of that name, whatever it is; null: there is none
 };
 
 // Whether a line's object is a note for readers, with no call.
 bool isNote(const Json& object);
+// What a note says, with its reason.
+std::string noteText(const Json& note);
 
 // The call of a line's object. Members beyond those of the call are ignored. Throws InputError if it has none.
 TraceCall readCall(const Json& object);

@@ -29,8 +29,9 @@ inline constexpr char kOptionHex[] = "optionHex";
 inline constexpr char kRecord[] = "record";
 inline constexpr char kTruth[] = "truth";
 
-// A note.
+// A note, or a head.
 inline constexpr char kTimeUnit[] = "timeUnit";
+inline constexpr char kClassNames[] = "classNames";
 
 // What came of it.
 inline constexpr char kReturned[] = "returned";

@@ -8,6 +8,7 @@
 #include "terminal/interrupt.h"
 #include "trace/byte_order_mark.h"
 #include "trace/time_unit.h"
+#include "trace/trace_time.h"
 
 namespace senseloom::tool {
 namespace {
@@ -123,15 +124,31 @@ bool TraceReader::readAboutRecording(const Json& object) {
   } else {
     return false;
   }
+  if (onAside) onAside(lineNumber, object);
   return true;
 }
 
 void TraceReader::readNote(const Json& note) {
   if (hasMember(note, member::kBreach)) remark(position() + ": " + textMember(note, member::kNote));
-  const json_t* said = json_object_get(note.get(), member::kTimeUnit);
+  readAboutRecords(note);
+}
+
+void TraceReader::readAboutRecords(const Json& object) {
+  if (const json_t* said = json_object_get(object.get(), member::kTimeUnit)) {
+    if (!json_is_string(said)) throw InputError("\"timeUnit\" must be a string");
+    unit = timeUnitNamed(json_string_value(said));
+  }
+  const json_t* said = json_object_get(object.get(), member::kClassNames);
   if (said == nullptr) return;
-  if (!json_is_string(said)) throw InputError("\"timeUnit\" must be a string");
-  unit = timeUnitNamed(json_string_value(said));
+  names.clear();
+  for (size_t i = 0; i < json_array_size(said); ++i) {
+    const char* text = json_string_value(json_array_get(said, i));
+    if (text == nullptr) break;
+    names.emplace_back(text);
+  }
+  if (names.size() != json_array_size(said) || names.empty()) {
+    throw InputError("\"classNames\" must be an array of strings");
+  }
 }
 
 void TraceReader::readHead(const Json& object) {
@@ -143,6 +160,8 @@ void TraceReader::readHead(const Json& object) {
   if (isRecording)
     throw InputError("another recording, or another part of it, begins here: each is a trace of its own");
   isRecording = true;
+  start = clockFromText(textMember(object, member::kStarted));
+  readAboutRecords(object);
 }
 
 void TraceReader::readEnd(const Json& object) {

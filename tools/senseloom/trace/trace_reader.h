@@ -7,8 +7,10 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 
 #include "trace/byte_stream.h"
+#include "trace/class_names.h"
 #include "trace/json.h"
 #include "trace/trace_call.h"
 
@@ -31,6 +33,18 @@ class TraceReader {
   // How long a unit of the timestamps is, in nanoseconds, if a note so far says so.
   std::optional<int64_t> timeUnit() const { return unit; }
 
+  // When the recording began, in nanoseconds since 1970, if it says so.
+  std::optional<int64_t> started() const { return start; }
+  // The names of the classes from 0 on, if the head or a note so far has them.
+  const ClassNames& classNames() const { return names; }
+
+  // Has passed on what is no call: notes, and the head and the end of a recording, each with its line.
+  using AsideListener = std::function<void(size_t line, const Json& object)>;
+  void listen(AsideListener toAsides) { onAside = std::move(toAsides); }
+
+  // The last line that was read, with its line feed.
+  std::string_view line() const { return std::string_view(buffer).substr(lineStart, lineLength); }
+
   // Where the last line was read, for messages: "FILE:LINE", or the file alone before the first one.
   std::string position() const;
 
@@ -48,6 +62,8 @@ class TraceReader {
   bool readLine();
   bool readAboutRecording(const Json& object);
   void readNote(const Json& note);
+  // What a note or a head may say of the records.
+  void readAboutRecords(const Json& object);
   void readHead(const Json& object);
   void readEnd(const Json& object);
   std::nullopt_t end();
@@ -62,6 +78,9 @@ class TraceReader {
   size_t lineNumber = 0;
   uint64_t byteCount = 0;
   std::optional<int64_t> unit;
+  std::optional<int64_t> start;
+  ClassNames names;
+  AsideListener onAside;
   uint64_t calls = 0;
   bool isRecording = false;  // it has a head
   bool hasEnd = false;

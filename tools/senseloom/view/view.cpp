@@ -23,7 +23,9 @@ void view(std::FILE* out, const ViewArguments& arguments) {
   const auto output = withProgress(std::move(data), trace, out, false);
   Replayer(*output).replay(trace);
   writePage(sink, gathered,
-            {.title = traceTitle(arguments.trace), .timeUnit = trace.timeUnit(), .classNames = arguments.classNames});
+            {.title = traceTitle(arguments.trace),
+             .timeUnit = trace.timeUnit(),
+             .classNames = classNamesOf(arguments.classNames, trace)});
   sink.commit();
 }
 

@@ -9,8 +9,8 @@ namespace senseloom::tool {
 // What the user says about a page.
 struct ViewArguments {
   std::string trace;
-  std::string page = {};                     // its file; empty: standard output
-  std::vector<std::string> classNames = {};  // from class 0 on
+  std::string page = {};        // its file; empty: standard output
+  std::string classNames = {};  // for readClassNames(); empty: those of the trace
 };
 
 // Replays a trace and writes the page of it, to `out` if no file is given. Throws InputError as TraceReader and

@@ -3,6 +3,7 @@
 #include <CLI/CLI.hpp>
 #include <memory>
 
+#include "command_line/call_options.h"
 #include "view/view.h"
 
 namespace senseloom::tool {
@@ -18,12 +19,7 @@ void declareView(CLI::App& app, Action& action) {
   command->add_option("TRACE", arguments->trace, "the trace; - is standard input")->required()->type_name("TRACE");
   command->add_option("-o,--output", arguments->page, "the page; else it is written to standard output")
       ->type_name("FILE");
-  command
-      ->add_option("--class-names", arguments->classNames,
-                   "names for the classes on the page, from class 0 on: A,B,...")
-      ->delimiter(',')
-      ->allow_extra_args(false)
-      ->type_name("NAMES");
+  addClassNamesOption(*command, arguments->classNames);
   command->callback([arguments, &action] { action = [arguments](std::FILE* out) { view(out, *arguments); }; });
 }
 

@@ -26,12 +26,13 @@ SPIN: spin
 """
 RECEIVED = """\
   line  call        session   sensor  return  outcome
+     1  note                                  Class 3 is bit 2 of the mask, so the first of the two clients does not get it.
      2  open        left      SPIN    handle
-     3  set_option  left      SPIN    0       221 classMask=3, 222 speed=7
+     3  set_option  left      SPIN    0       {"classMask":3,"speed":7} -> 221 classMask=3, 222 speed=7
      4  open        all       SPIN    handle
-     5  set_option  all       SPIN    0       221 classMask=15, 222 speed=4
-     6  dispatch    left      SPIN    0
-     7  dispatch    all       SPIN    1       timestamp=1 class=3
+     5  set_option  all       SPIN    0       {"classMask":15,"speed":4} -> 221 classMask=15, 222 speed=4
+     6  dispatch    left      SPIN    0       timestamp=1 class=3
+     7  dispatch    all       SPIN    1       timestamp=1 class=3 -> the record
      8  close       all       SPIN    1       221 classMask=3, 222 speed=7
      9  close       left      SPIN    0
 """

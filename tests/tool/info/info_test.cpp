@@ -1,0 +1,64 @@
+#include <gtest/gtest.h>
+
+#include "run_tool.h"
+
+namespace senseloom::tool {
+namespace {
+
+constexpr char kTrace[] =
+    R"({"format":1,"tool":"1.0.0","library":"/lib/libsenseloom.so.1","program":"/usr/bin/sensord","process":7301,"bits":32,"started":"2026-11-21T21:31:57.064729Z","clock":"CLOCK_MONOTONIC","part":1}
+{"call":"open","session":"s1","sensor":"STAP","returned":"handle","atUs":5}
+{"call":"open","session":"s2","sensor":"LIFT","returned":"handle","atUs":6}
+{"call":"open","session":"s3","sensor":"LPE_P","returned":null,"atUs":6}
+{"call":"set_option","session":"s1","option":"{}","returned":0,"atUs":7}
+{"note":"lines missing here: 3","why":"No space left on device"}
+{"call":"dispatch","session":"s1","record":{"hex":"05000000000000000100"},"returned":1,"atUs":8}
+{"call":"dispatch","session":"s2","record":{"hex":"09000000000000000100"},"returned":1,"atUs":3723004000}
+{"call":"close","session":"s1","returned":0,"atUs":3723004001}
+{"end":7,"lost":3,"why":"No space left on device"}
+)";
+
+TEST(Info, TellsWhatATraceHoldsAndWhatIsLeftOpen) {
+  const ToolRun run = runTool({"info", "-"}, kTrace);
+  EXPECT_EQ(run.out,
+            "trace: standard input\n"
+            "program: /usr/bin/sensord\n"
+            "process: 7301\n"
+            "bits: 32\n"
+            "library: /lib/libsenseloom.so.1\n"
+            "tool: 1.0.0\n"
+            "started: 2026-11-21T21:31:57.064729Z\n"
+            "part: 1\n"
+            "calls: 3 open, 1 set_option, 2 dispatch, 1 close\n"
+            "notes: 1\n"
+            "timestamps: 5 to 9\n"
+            "duration: 1:02:03.004\n"
+            "  sensor  sessions  options  records\n"
+            "  STAP           1        1        1\n"
+            "  LIFT           1        0        1\n"
+            "standard input:10: 3 lines could not be recorded: No space left on device\n"
+            "leak: session \"s2\" on LIFT, opened on line 3, is never closed\n");
+  EXPECT_EQ(run.err, "");
+  EXPECT_EQ(run.status, 0);
+}
+
+TEST(Info, PrintsJson) {
+  const ToolRun run = runTool({"info", "--json", "-"}, R"({"note":"x","timeUnit":"s"}
+{"call":"open","session":"a","sensor":"STAP"}
+{"call":"dispatch","sensor":"STAP","record":{"timestamp":1,"classes":1}}
+{"call":"dispatch","sensor":"STAP","record":{"timestamp":91,"classes":1}}
+)");
+  EXPECT_EQ(run.out, R"({"trace":"standard input","calls":"1 open, 2 dispatch","notes":"1","timestamps":"1 to 91",)"
+                     R"("duration":"0:01:30.000","sensors":[{"sensor":"STAP","sessions":1,"options":0,"records":2}],)"
+                     R"("remarks":[],"leaks":[{"session":"a","sensor":"STAP","line":2}]})"
+                     "\n");
+}
+
+TEST(Info, ReportsBadInput) {
+  const ToolRun run = runTool({"info", "README.md"});
+  EXPECT_EQ(run.err.rfind("senseloom: README.md:1: not JSON: ", 0), 0U) << run.err;
+  EXPECT_EQ(run.status, 2);
+}
+
+}  // namespace
+}  // namespace senseloom::tool

@@ -1,0 +1,100 @@
+#include <gtest/gtest.h>
+
+#include <fstream>
+#include <string>
+
+#include "recording.h"
+
+namespace senseloom::tool {
+namespace {
+
+const std::string kOpenA = R"({"call":"open","session":"a","sensor":"PHYAC","returned":"handle","atUs":10})"
+                           "\n";
+const std::string kOpenB = R"({"call":"open","session":"b","sensor":"PHYAC","returned":"handle","atUs":20})"
+                           "\n";
+const std::string kOpenC = R"({"call":"open","session":"c","sensor":"LIFT","returned":"handle","atUs":30})"
+                           "\n";
+const std::string kHead = R"({"format":1,"started":"2026-11-21T21:31:57.000000Z","clock":"CLOCK_MONOTONIC"})"
+                          "\n";
+const std::string kNote = "{\"note\":\"in the middle\"}\n";
+
+std::string dispatch(const std::string& session, int second) {
+  return R"({"call":"dispatch","session":")" + session +
+         R"(","record":{"hex":"000000000000000001000000"},"returned":0,"atUs":)" + std::to_string(second * 1000000) +
+         "}\n";
+}
+const std::string kTrace = kHead + kOpenA + kOpenB + kOpenC + dispatch("a", 1) + dispatch("b", 2) + kNote +
+                           dispatch("c", 3) + dispatch("a", 4) + R"({"call":"close","session":"a","atUs":5000000})" +
+                           "\n" + R"({"end":8,"lost":0})" + "\n";
+
+std::string trimmed(std::vector<std::string> arguments) {
+  const ScratchFile trace("whole_trace");
+  std::ofstream(trace.name) << kTrace;
+  arguments.insert(arguments.begin(), {"trim", trace.name});
+  const ToolRun run = runTool(arguments);
+  EXPECT_EQ(run.err, "");
+  EXPECT_EQ(run.status, 0);
+  return run.out;
+}
+
+TEST(Trim, KeepsTheRecordsOfASessionAndWhatTheyNeed) {
+  EXPECT_EQ(trimmed({"--session", "b"}), kHead + kOpenA + kOpenB + dispatch("b", 2) + kNote +
+                                             R"({"call":"close","session":"a","atUs":5000000})" +
+                                             "\n{\"end\":4,\"lost\":0}\n");
+}
+
+TEST(Trim, KeepsTheRecordsOfASensor) {
+  EXPECT_EQ(trimmed({"--sensor", "LIFT"}), kHead + kOpenC + kNote + dispatch("c", 3) + "{\"end\":2,\"lost\":0}\n");
+}
+
+TEST(Trim, CutsByTimeAndLineAndMarksSessionsThatWereOpenBefore) {
+  const std::string resumed =
+      R"({"call":"open","session":"a","sensor":"PHYAC","returned":"handle","atUs":10,"resumed":1})"
+      "\n";
+  const auto expectPart = [&](const std::string& part) {
+    EXPECT_EQ(part.substr(0, kHead.size() + resumed.size()), kHead + resumed);
+    // What a had gathered, without its outcome.
+    const std::string gathered =
+        R"({"call":"dispatch","session":"a","record":{"hex":"000000000000000001000000"},"atUs":1000000})"
+        "\n";
+    EXPECT_NE(part.find(gathered + dispatch("b", 2) + kNote + dispatch("c", 3) + "{\"end\":6,"), std::string::npos)
+        << part;
+    EXPECT_EQ(part.find("close"), std::string::npos);
+  };
+  expectPart(trimmed({"--from", "2s", "--to", "3s"}));
+  expectPart(trimmed({"--from", "6", "--to", "8"}));
+}
+
+TEST(Trim, MakesAPartThatReplaysAsRecorded) {
+  const ScratchFile recording("recording");
+  ASSERT_EQ(recordTo(recording.name, {TOOL_FILE, "replay", "--quiet", "commute.jsonl"}).status, 0);
+  for (const std::vector<std::string>& part :
+       {std::vector<std::string>{"--session", "s2"}, {"--from", "1000", "--to", "1700"}}) {
+    const ScratchFile file("part");
+    std::vector<std::string> arguments{"trim", recording.name, "-o", file.name};
+    arguments.insert(arguments.end(), part.begin(), part.end());
+    EXPECT_EQ(runTool(arguments).err, "");
+    const ToolRun checked = check(file.name);
+    EXPECT_EQ(checked.status, 0) << checked.out << checked.err;
+  }
+}
+
+TEST(Trim, OverwritesNothing) {
+  const ScratchFile file("kept");
+  std::ofstream(file.name) << "kept";
+  const ToolRun run = runTool({"trim", "lift.jsonl", "-o", file.name});
+  EXPECT_EQ(run.err, "senseloom: " + file.name + ": holds something already\n");
+  EXPECT_EQ(run.status, 2);
+  EXPECT_EQ(contentOf(file.name), "kept");
+}
+
+TEST(Trim, ReportsWhatItCannotDo) {
+  EXPECT_EQ(runTool({"trim", "-", "--session", "a"}).err,
+            "senseloom: standard input cannot be read twice, as naming a session takes\n");
+  EXPECT_EQ(runTool({"trim", "lift.jsonl", "--session", "none"}).err,
+            "senseloom: lift.jsonl: no session of that name is opened\n");
+  EXPECT_EQ(runTool({"trim", "lift.jsonl", "--session", "none"}).status, 2);
+}
+
+}  // namespace
+}  // namespace senseloom::tool

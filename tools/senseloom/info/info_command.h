@@ -1,0 +1,9 @@
+#pragma once
+
+#include "command.h"
+
+namespace senseloom::tool {
+
+Declare declareInfo;
+
+}  // namespace senseloom::tool

@@ -1,0 +1,180 @@
+#include "info/trace_info.h"
+
+#include <algorithm>
+#include <array>
+#include <cstdint>
+#include <map>
+#include <optional>
+#include <utility>
+#include <vector>
+
+#include "input_error.h"
+#include "terminal/text_table.h"
+#include "trace/json.h"
+#include "trace/record_codec.h"
+#include "trace/record_field.h"
+#include "trace/time_unit.h"
+#include "trace/trace_reader.h"
+#include "trace/trace_time.h"
+
+namespace senseloom::tool {
+namespace {
+
+struct SensorCounts {
+  size_t sessions = 0;
+  size_t options = 0;
+  size_t records = 0;
+};
+
+struct OpenSession {
+  const Sensor* sensor;
+  size_t line;
+};
+
+// What is told of a trace, as (name, text), for people and for programs alike.
+using Fact = std::pair<std::string, std::string>;
+
+class TraceInfo {
+ public:
+  explicit TraceInfo(const std::string& file)
+      : reader(file, [this](const std::string& remark) { remarks.push_back(remark); }) {
+    reader.listen([this](size_t, const Json& aside) { takeAside(aside); });
+    try {
+      while (const auto call = reader.next()) take(*call);
+    } catch (const InputError& error) {
+      throw InputError(reader.position() + ": " + error.what());
+    }
+  }
+
+  void print(std::FILE* out) const {
+    for (const auto& [name, text] : facts()) std::fprintf(out, "%s: %s\n", name.c_str(), text.c_str());
+    std::vector<TextRow> rows{{"sensor", "sessions", "options", "records"}};
+    for (const auto& [sensor, counts] : sensors) {
+      rows.push_back({sensor->name, std::to_string(counts.sessions), std::to_string(counts.options),
+                      std::to_string(counts.records)});
+    }
+    printTable(out, rows, 1);
+    for (const std::string& remark : remarks) std::fprintf(out, "%s\n", remark.c_str());
+    for (const auto& [name, session] : open) {
+      std::fprintf(out, "leak: session \"%s\" on %s, opened on line %zu, is never closed\n", name.c_str(),
+                   session.sensor->name, session.line);
+    }
+  }
+
+  void printJson(std::FILE* out) const {
+    Json object(json_object());
+    for (const auto& [name, text] : facts()) addMember(object, name.c_str(), Json(json_string(text.c_str())));
+    Json list(json_array());
+    for (const auto& [sensor, counts] : sensors) {
+      json_array_append_new(list.get(),
+                            json_pack("{s:s,s:I,s:I,s:I}", "sensor", sensor->name, "sessions", number(counts.sessions),
+                                      "options", number(counts.options), "records", number(counts.records)));
+    }
+    addMember(object, "sensors", std::move(list));
+    Json told(json_array());
+    for (const std::string& remark : remarks) json_array_append_new(told.get(), json_string(remark.c_str()));
+    addMember(object, "remarks", std::move(told));
+    Json leaks(json_array());
+    for (const auto& [name, session] : open) {
+      json_array_append_new(leaks.get(), json_pack("{s:s,s:s,s:I}", "session", name.c_str(), "sensor",
+                                                   session.sensor->name, "line", number(session.line)));
+    }
+    addMember(object, "leaks", std::move(leaks));
+    std::fprintf(out, "%s\n", compactText(object.get()).c_str());
+  }
+
+ private:
+  static json_int_t number(size_t count) { return static_cast<json_int_t>(count); }
+
+  void takeAside(const Json& aside) {
+    if (isNote(aside)) {
+      ++notes;
+    } else if (json_object_get(aside.get(), member::kFormat) != nullptr) {
+      head.reset(json_incref(aside.get()));
+    }
+  }
+
+  void take(const TraceCall& call) {
+    ++calls[static_cast<size_t>(call.kind)];
+    if (call.kind == CallKind::open) takeOpen(call);
+    const Sensor* sensor = call.sensor;
+    if (sensor == nullptr && call.kind != CallKind::uninit) {
+      const auto session = open.find(call.session);
+      if (session == open.end()) return;  // one that did not open
+      sensor = session->second.sensor;
+    }
+    if (call.kind == CallKind::setOption) ++sensors[sensor].options;
+    if (call.kind == CallKind::dispatch) takeRecord(*sensor, call);
+    if (call.kind == CallKind::close) open.erase(call.session);
+    if (call.atMicroseconds) lastMicroseconds = call.atMicroseconds;
+  }
+
+  void takeOpen(const TraceCall& call) {
+    const json_t* returned = json_object_get(call.recorded.get(), member::kReturned);
+    if (json_is_null(returned)) return;  // it did not open
+    ++sensors[call.sensor].sessions;
+    open[call.session] = {call.sensor, call.line};
+  }
+
+  void takeRecord(const Sensor& sensor, const TraceCall& call) {
+    ++sensors[&sensor].records;
+    const auto record = encodeRecord(sensor, call.record.get());
+    const auto timestamp = recordField<uint64_t>(record, kTimestampOffset);
+    if (!timestamp) return;
+    if (!firstTimestamp) firstTimestamp = timestamp;
+    lastTimestamp = timestamp;
+  }
+
+  std::vector<Fact> facts() const {
+    std::vector<Fact> list{{"trace", reader.fileName()}};
+    for (const char* key : {member::kProgram, member::kProcess, member::kBits, member::kLibrary, member::kTool,
+                            member::kStarted, member::kPart}) {
+      const json_t* value = json_object_get(head.get(), key);
+      if (json_is_string(value)) list.emplace_back(key, json_string_value(value));
+      if (json_is_integer(value)) list.emplace_back(key, std::to_string(json_integer_value(value)));
+    }
+    std::string text;
+    for (const CallKind kind : kAllCalls) {
+      const size_t count = calls[static_cast<size_t>(kind)];
+      if (count > 0) text += (text.empty() ? "" : ", ") + std::to_string(count) + ' ' + callName(kind);
+    }
+    list.emplace_back("calls", text.empty() ? "none" : text);
+    if (notes > 0) list.emplace_back("notes", std::to_string(notes));
+    if (firstTimestamp) {
+      list.emplace_back("timestamps", std::to_string(*firstTimestamp) + " to " + std::to_string(*lastTimestamp));
+    }
+    if (const auto length = duration()) list.emplace_back("duration", elapsedText(*length));
+    return list;
+  }
+
+  std::optional<int64_t> duration() const {
+    if (lastMicroseconds) return *lastMicroseconds * 1000;
+    const auto unit = reader.timeUnit();
+    if (!unit || !firstTimestamp || *lastTimestamp < *firstTimestamp) return std::nullopt;
+    return timeOf(*lastTimestamp - *firstTimestamp, *unit);
+  }
+
+  std::vector<std::string> remarks;
+  TraceReader reader;
+  Json head;
+  std::array<size_t, kAllCalls.size()> calls{};
+  size_t notes = 0;
+  std::map<const Sensor*, SensorCounts> sensors;  // in the order of the tool's table
+  std::map<std::string, OpenSession> open;
+  std::optional<uint64_t> firstTimestamp;
+  std::optional<uint64_t> lastTimestamp;
+  std::optional<int64_t> lastMicroseconds;
+};
+
+}  // namespace
+
+void printInfo(std::FILE* out, const std::string& trace, bool json) {
+  const TraceInfo info(trace);
+  if (json) {
+    info.printJson(out);
+  } else {
+    info.print(out);
+  }
+}
+
+}  // namespace senseloom::tool

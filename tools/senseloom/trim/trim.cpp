@@ -1,0 +1,184 @@
+#include "trim/trim.h"
+
+#include <algorithm>
+#include <filesystem>
+#include <functional>
+#include <map>
+#include <memory>
+#include <optional>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+#include "input_error.h"
+#include "model/kinds.h"
+#include "terminal/new_file.h"
+#include "trace/record_codec.h"
+#include "trace/trace_reader.h"
+
+namespace senseloom::tool {
+namespace {
+
+// A session that has not had a result for longer is cut off.
+constexpr size_t kMostCarried = 10'000;
+constexpr mode_t kOwnerAlone = 0600;  // a trace holds what the sensors saw
+
+void discard(const std::string& /*remark*/) {}
+
+void requireNew(const std::string& file) {
+  std::error_code error;
+  if (std::filesystem::is_regular_file(file, error) && std::filesystem::file_size(file, error) > 0) {
+    throw InputError(file + ": holds something already");
+  }
+}
+
+// The sensors of the sessions of these names.
+std::vector<std::string> sensorsOf(const std::string& trace, const std::vector<std::string>& sessions) {
+  if (trace == "-") throw InputError("standard input cannot be read twice, as naming a session takes");
+  TraceReader reader(trace, discard);
+  std::vector<std::string> sensors;
+  try {
+    while (const auto call = reader.next()) {
+      const bool isNamed = std::find(sessions.begin(), sessions.end(), call->session) != sessions.end();
+      if (call->kind == CallKind::open && isNamed) sensors.emplace_back(call->sensor->name);
+    }
+  } catch (const InputError& error) {
+    throw InputError(reader.position() + ": " + error.what());
+  }
+  if (sensors.empty()) throw InputError(trace + ": no session of that name is opened");
+  return sensors;
+}
+
+// A record from before the part, without its outcome.
+struct Carried {
+  std::string session;
+  const Sensor* sensor;
+  std::string line;
+};
+
+class Trimmer {
+ public:
+  Trimmer(std::FILE* stream, const std::string& trace, const std::string& file, const FilterArguments& arguments)
+      : out(stream), reader(trace), filter(arguments, reader), sensors(arguments.sensors) {
+    if (!arguments.sessions.empty()) sensors = sensorsOf(trace, arguments.sessions);
+    if (!file.empty()) requireNew(file);
+    if (!file.empty()) target.emplace(file, kOwnerAlone, NewFile::Rest::removed);
+    reader.listen([this](size_t, const Json& aside) { takeAside(aside); });
+  }
+
+  void run() {
+    try {
+      while (const auto call = reader.next()) take(*call);
+    } catch (const InputError& error) {
+      throw InputError(reader.position() + ": " + error.what());
+    }
+    if (isRecording) write("{\"end\":" + std::to_string(calls) + ",\"lost\":0}\n");
+    if (target) target->commit();
+  }
+
+ private:
+  void takeAside(const Json& aside) {
+    if (json_object_get(aside.get(), member::kEnd) != nullptr) return;  // it has an end of its own
+    if (json_object_get(aside.get(), member::kFormat) != nullptr) isRecording = true;
+    write(reader.line());
+  }
+
+  void take(const TraceCall& call) {
+    const Sensor* sensor = sensorOf(call);
+    if (!isConcerned(sensor)) return;
+    const auto record = call.record == nullptr ? std::vector<uint8_t>() : encodeRecord(*sensor, call.record.get());
+    const CallOutcome outcome{.call = call, .session = call.session, .sensor = sensor, .record = record};
+    // A dispatch to a whole sensor goes to the sessions that are wanted, too.
+    const bool isWanted = filter.takes(outcome) || (call.session.empty() && filter.isWithin(outcome));
+    if (filter.isBehind(outcome)) return;
+    const bool isBefore = !filter.isWithin(outcome);
+    if (!isBefore) writeCarried();
+    if (isBefore) carry(call, sensor);
+    if (call.kind == CallKind::dispatch && !isWanted) return;
+    const bool isResumed =
+        call.kind == CallKind::open && isBefore && call.recorded != nullptr && filter.takes(call.session, sensor);
+    writeCall(isResumed ? changed([](const Json& line) { addMember(line, member::kResumed, Json(json_integer(1))); })
+                        : std::string(reader.line()));
+  }
+
+  // Keeps what a session has gathered for its next result, which the part begins in the middle of.
+  void carry(const TraceCall& call, const Sensor* sensor) {
+    if (sensor == nullptr) return;
+    const model::Judging judging = model::rowOf(model::kindNamed(sensor->name)).judging;
+    if (judging != model::Judging::activity && judging != model::Judging::gathering) return;
+    const json_t* returned = json_object_get(call.recorded.get(), member::kReturned);
+    const bool isDispatch = call.kind == CallKind::dispatch;
+    // With a negotiation, all activity sessions start over.
+    const bool hasNegotiated = json_object_get(call.recorded.get(), member::kProperties) != nullptr;
+    const bool isRestart = hasNegotiated && judging == model::Judging::activity;
+    const bool isFinished = call.kind == CallKind::close || (isDispatch && json_integer_value(returned) == 1);
+    if (isRestart || isFinished || carried.size() > kMostCarried) {
+      std::erase_if(carried,
+                    [&](const Carried& one) { return isRestart ? one.sensor == sensor : one.session == call.session; });
+    } else if (isDispatch && call.recorded != nullptr && filter.takes(call.session, sensor)) {
+      carried.push_back({call.session, sensor, changed([](const Json& line) {
+                           json_object_del(line.get(), member::kReturned);
+                           json_object_del(line.get(), member::kResult);
+                         })});
+    }
+  }
+
+  void writeCarried() {
+    for (const Carried& one : carried) writeCall(one.line);
+    carried.clear();
+  }
+
+  const Sensor* sensorOf(const TraceCall& call) {
+    if (call.kind == CallKind::open) opened[call.session] = call.sensor;
+    if (call.sensor != nullptr || call.kind == CallKind::uninit) return call.sensor;
+    const auto known = opened.find(call.session);
+    if (known == opened.end()) throw InputError("no session \"" + call.session + "\" is open");
+    return known->second;
+  }
+  // What is no sensor's concerns all.
+  bool isConcerned(const Sensor* sensor) const {
+    return sensor == nullptr || sensors.empty() ||
+           std::find(sensors.begin(), sensors.end(), sensor->name) != sensors.end();
+  }
+
+  // The line that was read last, as a function changes it.
+  std::string changed(const std::function<void(const Json& line)>& change) const {
+    const Json object(json_loadb(reader.line().data(), reader.line().size(), 0, nullptr));
+    change(object);
+    return compactText(object.get()) + '\n';
+  }
+
+  void writeCall(std::string_view line) {
+    ++calls;
+    write(line);
+  }
+
+  void write(std::string_view line) {
+    const bool isWhole = line.ends_with('\n');
+    if (target) {
+      target->write(line);
+      if (!isWhole) target->write("\n");
+    } else {
+      std::fwrite(line.data(), 1, line.size(), out);
+      if (!isWhole) std::fputc('\n', out);
+    }
+  }
+
+  std::FILE* out;
+  TraceReader reader;
+  CallFilter filter;
+  std::vector<std::string> sensors;  // concerned; empty: all
+  std::optional<NewFile> target;
+  std::map<std::string, const Sensor*> opened;  // sessions by name, as opened last
+  std::vector<Carried> carried;
+  bool isRecording = false;
+  size_t calls = 0;
+};
+
+}  // namespace
+
+void trim(std::FILE* out, const std::string& trace, const std::string& file, const FilterArguments& filter) {
+  Trimmer(out, trace, file, filter).run();
+}
+
+}  // namespace senseloom::tool
