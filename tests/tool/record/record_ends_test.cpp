@@ -143,5 +143,20 @@ TEST(RecordEnds, EndsAReplayThatIsInterruptedWithItsSummary) {
             "a        LIFT           1         0         0         0\n");
 }
 
+TEST(RecordEnds, EndsWhatIsInterruptedWithAWholeFile) {
+  const ScratchFolder folder("interrupted");
+  for (const std::vector<std::string>& command :
+       {std::vector<std::string>{TOOL_FILE, "convert", "--to", "perfetto", "-o", folder.file("events"), "-"},
+        {TOOL_FILE, "view", "-o", folder.file("page"), "-"}}) {
+    BackgroundProgram tool(command);
+    tool.tell(R"({"call":"open","session":"a","sensor":"LIFT"})");
+    tool.waitUntilItWaits();
+    tool.send(SIGINT);
+    EXPECT_EQ(tool.finish().status, -1);
+  }
+  EXPECT_EQ(folder.files(), (std::vector<std::string>{"events", "page"}));
+  EXPECT_NE(contentOf(folder.file("page")).find("</html>"), std::string::npos);
+}
+
 }  // namespace
 }  // namespace senseloom::tool

@@ -8,6 +8,7 @@
 #include "explain/explainer.h"
 #include "explain/log_capture.h"
 #include "replay/replay_progress.h"
+#include "terminal/interrupt.h"
 #include "terminal/output_sink.h"
 #include "trace/replayer.h"
 #include "trace/time_unit.h"
@@ -55,6 +56,7 @@ std::unique_ptr<TraceConverter> converterTo(const std::string& form, OutputSink&
 }  // namespace
 
 void convertTrace(std::FILE* out, const TraceConversion& conversion) {
+  const InterruptMark mark;
   TraceReader trace(conversion.trace);
   OutputSink sink(out, conversion.file, conversion.trace);
   const auto converter = converterTo(conversion.to, sink);

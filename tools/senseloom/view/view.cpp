@@ -6,6 +6,7 @@
 #include "explain/log_capture.h"
 #include "plot/replay_plot.h"
 #include "replay/replay_progress.h"
+#include "terminal/interrupt.h"
 #include "terminal/output_sink.h"
 #include "trace/replayer.h"
 #include "trace/trace_reader.h"
@@ -15,6 +16,7 @@
 namespace senseloom::tool {
 
 void view(std::FILE* out, const ViewArguments& arguments) {
+  const InterruptMark mark;
   TraceReader trace(arguments.trace);
   OutputSink sink(out, arguments.page, arguments.trace);
   LogCapture log;
