@@ -56,13 +56,13 @@ check-packages: packages
 release:
 	scripts/release.sh $(MAKE)
 
-# Prints how well digits are recognised that were not learned from; of the recordings in DATA, a folder laid out as data/.
+# Prints how well is sensed and recognised what was not learned from; of the recordings in DATA, a folder laid out as data/.
 DATA := data
 accuracy:
 	$(call install,build test)
 	read -r preset _ <<<"$$(scripts/host-presets.sh x86 native)"; \
-	$(call build,$$preset,-DBUILD_TESTING=ON,accuracy_recognise) && \
-	tests/accuracy/digits.py build/$$preset $(DATA)
+	$(call build,$$preset,-DBUILD_TESTING=ON,accuracy_recognise accuracy_sensing) && \
+	tests/accuracy/accuracy.py build/$$preset $(DATA)
 
 # Times the library beside what one would write instead, and prints ratios.
 bench:

@@ -1,12 +1,9 @@
-#!/usr/bin/python3
-"""How well the gesture engine recognises digits, on drawings that it was not learned from. Prints tables.
+"""How well the gesture engine recognises digits, on drawings that it was not learned from.
 
-    tests/accuracy/digits.py BUILD [FOLDER]
-
-BUILD is the folder of a build. Without FOLDER, the drawings in data/ are divided, the templates are learned anew from
-one part, and the engine is built with them and fed the other. With FOLDER, which is laid out like data/, the engine is
-fed as it is built, but for drawings that it was learned from. Where there are recordings of daily movement (activity/),
-the engine as it is built is fed windows of them, too: it should recognise nothing there.
+The drawings in data/ are divided, the templates are learned anew from one part, and the engine is built with them and fed
+the other. Of another folder, which is laid out like data/, the engine is fed the drawings as it is built, but for those that
+it was learned from. Where there are recordings of daily movement (activity/), the engine as it is built is fed windows of
+them, too: it should recognise nothing there.
 """
 
 import csv
@@ -51,24 +48,26 @@ def samples_of(row):
     return tuple(int(row[name]) for name in learn_digits.COLUMNS)
 
 
-def recognise(build, movements, engine=None):
-    """What the library finds in each movement: a digit or None; and the microseconds that each took."""
+def recognise(build, movements, engine=None, hub=False):
+    """What the library finds in each movement: a digit or None; and the microseconds that each took.
+
+    With `hub`, the sensor hub finds the drawing in it."""
     environment = dict(os.environ)
     environment.pop("SENSELOOM_GESTURE_SCRIPT", None)
     if engine:
         environment["LD_LIBRARY_PATH"] = str(engine)
     lines = "".join(" ".join(str(value) for sample in movement for value in sample) + "\n" for movement in movements)
     output = subprocess.run(
-        [build / "bin" / "accuracy_recognise"], input=lines, env=environment, text=True, check=True, stdout=subprocess.PIPE
+        [build / "bin" / "accuracy_recognise", *(["--hub"] if hub else [])], input=lines, env=environment, text=True, check=True, stdout=subprocess.PIPE
     ).stdout.splitlines()
     assert len(output) == len(movements)
     classes = [int(line.split()[0]) for line in output]
     return [found % 10 if found else None for found in classes], [float(line.split()[1]) for line in output]
 
 
-def results_of(build, drawings, engine=None):
+def results_of(build, drawings, engine=None, hub=False):
     """Of each drawing: its digit, what the library finds, and the microseconds that it took."""
-    found, times = recognise(build, [samples for _, _, samples in drawings], engine)
+    found, times = recognise(build, [samples for _, _, samples in drawings], engine, hub)
     return [(digit, answer, time) for (digit, _, _), answer, time in zip(drawings, found, times)]
 
 
@@ -84,7 +83,7 @@ def build_engine(build, learned, folder):
     )
 
 
-def cross_validate(build, drawings, parts):
+def cross_validate(build, drawings, parts, hub=False):
     """Of the drawings in each part, what is found by an engine that learned from all other parts."""
     results = []
     for part in parts:
@@ -92,7 +91,7 @@ def cross_validate(build, drawings, parts):
             engine = pathlib.Path(name)
             build_engine(build, [drawing for i, drawing in enumerate(drawings) if i not in part], engine)
             tested = [drawings[i] for i in sorted(part)]
-            results += results_of(build, tested, engine)
+            results += results_of(build, tested, engine, hub)
     return results
 
 
@@ -133,6 +132,8 @@ def cross_validation_table(build, drawings):
     for seed in range(1, RANDOM_SPLITS + 1):
         results = cross_validate(build, drawings, random_parts(len(drawings), seed))
         table_row(f"each random fifth (seed {seed})", "the other four fifths", results)
+    results = cross_validate(build, drawings, random_parts(len(drawings), 1), hub=True)
+    table_row("each random fifth (seed 1), found by the hub", "the other four fifths", results)
     for name, key in (("five drawings of each digit that follow each other", lambda n: n // 5), ("sitting", lambda n: n // 10)):
         parts = parts_by(drawings, key)
         table_row(f"each {name}", "all others", cross_validate(build, drawings, list(parts.values())))
@@ -149,12 +150,15 @@ def built_engine_table(build, folder):
         return
     table_head()
     table_row(f"those of {folder}", "data/", results_of(build, drawings))
+    table_row(f"those of {folder}, found by the hub", "data/", results_of(build, drawings, hub=True))
 
 
 def windows_of(path, length):
     """Windows of the length in ms, one each HOP_MS; none if the file has no angular rates."""
     times, samples = [], []
     for row in rows_of(path):
+        if not set(learn_digits.COLUMNS) <= set(row):
+            return
         times.append(int(row["t_ms"]))
         samples.append(samples_of(row))
     begin = end = 0
@@ -178,18 +182,11 @@ def movement_table(build, folder):
         print(f"| windows of {length / 1000:g} s, one a second | {hours:.1f} | {len(windows)} | {accepted} | {high(times):.2f} |")
 
 
-def main():
-    if len(sys.argv) not in (2, 3):
-        sys.exit(f"usage: {sys.argv[0]} BUILD [FOLDER]")
-    build = pathlib.Path(sys.argv[1]).resolve()
-    folder = pathlib.Path(sys.argv[2]) if len(sys.argv) == 3 else REPOSITORY / "data"
-    if folder.resolve() == REPOSITORY / "data":
-        cross_validation_table(build, drawings_of(folder))
-    else:
-        built_engine_table(build, folder)
-    if (folder / "activity").is_dir():
+def print_tables(build, folder):
+    if (folder / "digits").is_dir():
+        if folder.resolve() == REPOSITORY / "data":
+            cross_validation_table(build, drawings_of(folder))
+        else:
+            built_engine_table(build, folder)
+    if any((folder / "activity").glob("*.csv.gz")):
         movement_table(build, folder)
-
-
-if __name__ == "__main__":
-    main()

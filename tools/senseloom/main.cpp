@@ -26,6 +26,7 @@
 #include "input_error.h"
 #include "record/record_command.h"
 #include "replay/replay_command.h"
+#include "sense/sense_command.h"
 #include "sensors/sensors_command.h"
 #include "status/status_command.h"
 #include "sweep/sweep_command.h"
@@ -37,9 +38,9 @@ namespace senseloom::tool {
 namespace {
 
 // In the order of the help.
-constexpr Declare* kCommands[] = {declareReplay, declareExplain,  declareView,    declareRecord,
-                                  declareStatus, declareInfo,     declareDiff,    declareTrim,
-                                  declareSweep,  declareGenerate, declareConvert, declareSensors};
+constexpr Declare* kCommands[] = {declareReplay,   declareExplain, declareView,   declareRecord, declareStatus,
+                                  declareInfo,     declareDiff,    declareTrim,   declareSense,  declareSweep,
+                                  declareGenerate, declareConvert, declareSensors};
 
 constexpr int kFailure = 1;
 constexpr int kBadInput = 2;

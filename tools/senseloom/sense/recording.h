@@ -1,0 +1,30 @@
+#pragma once
+
+#include <sample.h>
+
+#include <cstddef>
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "sense/recording_columns.h"
+
+namespace senseloom::tool {
+
+// What a phone's sensors said while a person carried it.
+struct Recording {
+  struct Row {
+    hub::Sample sample;
+    int32_t label;  // what the person really did; 0: nobody knows
+    size_t line;
+  };
+  std::vector<Row> rows;             // in order of time
+  std::vector<std::string> remarks;  // what is special about it, or was mended
+};
+
+// Reads a table with a heading and a row a sample: numbers between commas, semicolons or tabs. Rows that are a little
+// out of order are put in order. Throws InputError, with the file, the line and the column, for what is no recording
+// that a hub can sense from; `needsRate`: without angular rates it cannot.
+Recording readRecording(const std::string& file, const RecordingColumns& columns, bool needsRate);
+
+}  // namespace senseloom::tool

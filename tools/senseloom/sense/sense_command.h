@@ -1,0 +1,9 @@
+#pragma once
+
+#include "command.h"
+
+namespace senseloom::tool {
+
+Declare declareSense;
+
+}  // namespace senseloom::tool

@@ -1,0 +1,163 @@
+#include "sense/sensing_run.h"
+
+#include <algorithm>
+#include <utility>
+
+#include "input_error.h"
+#include "trace/hex.h"
+#include "trace/record_codec.h"
+#include "trace/trace_form.h"
+
+namespace senseloom::tool {
+namespace {
+
+constexpr char kClose[] = "close";
+
+class NoOutput final : public ReplayObserver {
+  void onOutcome(const CallOutcome&) override {}
+};
+
+Json text(const std::string& value) {
+  return Json(json_string(value.c_str()));
+}
+
+// By its fields, if they say all that it holds.
+Json recordJson(const Sensor& sensor, const hub::Record& record) {
+  const bool isWhole = sensor.items != Items::samples && sensor.bytesProperty < 0;
+  if (isWhole) return decodeResult(sensor, record.bytes);
+  Json bytes(json_object());
+  addMember(bytes, member::kHex, text(toHex(record.bytes)));
+  return bytes;
+}
+
+// Its classes are what labels mean.
+bool hasActivities(const Sensor& sensor) {
+  return sensor.name == std::string_view("PHYAC") || sensor.name == std::string_view("ISACT");
+}
+
+Json callLine(CallKind kind) {
+  Json line(json_object());
+  addMember(line, member::kCall, text(callName(kind)));
+  return line;
+}
+
+}  // namespace
+
+SensingRun::SensingRun(std::FILE* stream, const SensingArguments& given)
+    : out(stream),
+      arguments(given),
+      listener(withPlot(std::make_unique<NoOutput>(), given.recordings.front(), given.plot)),
+      replayer(*this) {}
+
+void SensingRun::run(const std::vector<Recording::Row>& rows) {
+  start();
+  auto changes = arguments.changes;
+  std::ranges::stable_sort(changes, {}, &SensingChange::after);
+  auto next = changes.begin();
+  for (const Recording::Row& row : rows) {
+    const int64_t after = row.sample.time - rows.front().sample.time;
+    for (; next != changes.end() && next->after <= after; ++next) change(*next);
+    for (const hub::Record& record : hub.take(row.sample)) dispatch(record, row.label);
+  }
+  for (const hub::Record& record : hub.finish()) dispatch(record, rows.back().label);
+  if (next != changes.end()) throw InputError("--at: the recording ends before the time for \"" + next->session + '"');
+  while (!open.empty()) close(open.front());
+  listener->onEnd();
+}
+
+void SensingRun::start() {
+  Json line(json_object());
+  std::string sources;
+  for (const std::string& recording : arguments.recordings) sources += (sources.empty() ? "" : ", ") + recording;
+  addMember(line, member::kNote, text("sensed from " + sources));
+  addMember(line, member::kTimeUnit, text("ms"));
+  write(line);
+  for (const SensingClient& client : arguments.clients) {
+    Json opening = callLine(CallKind::open);
+    addMember(opening, member::kSession, text(client.name));
+    addMember(opening, member::kSensor, text(client.sensor->name));
+    TraceCall call;
+    call.kind = CallKind::open;
+    call.session = client.name;
+    call.sensor = client.sensor;
+    perform(std::move(call), opening);
+    open.push_back(client.name);
+    setOption(client.name, client.option);
+  }
+}
+
+void SensingRun::change(const SensingChange& wanted) {
+  if (wanted.option == kClose) {
+    close(wanted.session);
+  } else {
+    setOption(wanted.session, wanted.option);
+  }
+}
+
+void SensingRun::setOption(const std::string& session, const std::string& option) {
+  Json line = callLine(CallKind::setOption);
+  addMember(line, member::kSession, text(session));
+  Json object(json_loads(option.c_str(), 0, nullptr));
+  addMember(line, member::kOption, json_is_object(object.get()) ? std::move(object) : text(option));
+  TraceCall call;
+  call.kind = CallKind::setOption;
+  call.session = session;
+  call.option = option;
+  perform(std::move(call), line);
+}
+
+void SensingRun::close(const std::string& session) {
+  Json line = callLine(CallKind::close);
+  addMember(line, member::kSession, text(session));
+  TraceCall call;
+  call.kind = CallKind::close;
+  call.session = session;
+  perform(std::move(call), line);
+  std::erase(open, session);
+}
+
+void SensingRun::dispatch(const hub::Record& record, int32_t label) {
+  const Sensor& sensor = sensorNamed(std::string(record.sensor));
+  TraceCall call;
+  call.kind = CallKind::dispatch;
+  call.sensor = &sensor;
+  call.record = recordJson(sensor, record);
+  Json line = callLine(CallKind::dispatch);
+  addMember(line, member::kSensor, text(sensor.name));
+  addMember(line, member::kRecord, Json(json_incref(call.record.get())));
+  const auto known = arguments.labels.find(label);
+  const int32_t truth = known == arguments.labels.end() ? label : known->second;
+  if (hasActivities(sensor) && truth != 0) addMember(line, member::kTruth, Json(json_integer(truth)));
+  perform(std::move(call), line);
+}
+
+void SensingRun::write(const Json& line) {
+  std::fprintf(out, "%s\n", compactText(line.get()).c_str());
+  ++lines;
+}
+
+void SensingRun::perform(TraceCall call, const Json& line) {
+  write(line);
+  call.line = lines;
+  replayer.perform(call);
+}
+
+void SensingRun::onOutcome(const CallOutcome& outcome) {
+  if (outcome.call.kind == CallKind::setOption && outcome.failed) {
+    throw InputError("the library refuses the option of session \"" + outcome.session +
+                     "\": " + outcome.call.option.value_or(""));
+  }
+  if (outcome.call.kind == CallKind::close && outcome.returned == 0) hub.stop(outcome.sensor->name);
+  if (outcome.properties) {
+    std::vector<hub::Property> list;
+    for (const Property& property : *outcome.properties) list.push_back({.id = property.id, .value = property.value});
+    try {
+      hub.configure(outcome.sensor->name, list);
+    } catch (const hub::Refused& refused) {
+      throw InputError("session \"" + outcome.session + "\": " + refused.what());
+    }
+  }
+  listener->onOutcome(outcome);
+}
+
+}  // namespace senseloom::tool
