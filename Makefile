@@ -11,12 +11,13 @@ build = echo "Building in build/$(1), which can take some minutes; build/$(1).lo
 # $(call install,TASKS)
 install = mkdir -p build && scripts/install-deps.sh $(1)
 
-# Replays a day's commute through three clients of the activity sensor, in the 32-bit build where the host has one.
+# Runs a recording of a person who sits, walks and climbs stairs through the sensor hub, the library and three clients, in the
+# 32-bit build where the host has one.
 demo:
 	$(call install,build)
 	read -r preset _ <<<"$$(scripts/host-presets.sh x86 native)"; \
 	$(call build,$$preset,-DBUILD_TESTING=OFF); \
-	build/$$preset/bin/senseloom replay examples/commute.jsonl
+	scripts/demo.sh build/$$preset/bin/senseloom
 
 # Builds and tests everything: both word sizes, optimised and under sanitizers.
 test:

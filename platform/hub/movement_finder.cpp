@@ -7,8 +7,8 @@
 namespace hub {
 namespace {
 
-constexpr std::int64_t kStillRate = 200;  // mrad/s; a hand that holds still turns the phone less than that
-constexpr std::size_t kStillness = 60;  // intervals that end a movement: 1.2 s; drawings have pauses shorter than that
+constexpr std::int64_t kStillRate = 150;  // mrad/s; a hand that holds still turns the phone less than that
+constexpr std::size_t kStillness = 75;  // intervals that end a movement: 1.5 s; drawings have pauses shorter than that
 constexpr std::size_t kLeastMoving = 20;  // intervals: 0.4 s
 constexpr std::size_t kMargin = 5;        // groups that are kept on both sides of a movement: 0.2 s
 

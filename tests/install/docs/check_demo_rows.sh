@@ -3,7 +3,7 @@
 set -euo pipefail
 tool=$1
 source=$2
-printed=$("$tool" replay "$source/examples/commute.jsonl" 2>&1)
+printed=$("$source/scripts/demo.sh" "$tool" 2>&1)
 # shellcheck disable=SC2016 # backquotes of the page
 shown=$(sed -n '/^### What `make demo` prints/,/^Each row/s/^    //p' "$source/README.md")
 [ "$(wc -l <<<"$shown")" -ge 3 ]

@@ -131,11 +131,13 @@ TEST(Sense, ReadsCompressedFiles) {
   EXPECT_EQ(withoutNote(sense(contentOf(compressed.name))), expected);
 }
 
-TEST(Sense, PutsRecordingsOneBehindTheOther) {
+TEST(Sense, PutsRecordingsOneBehindTheOtherWithAGapOfASecond) {
   const ScratchFile first("sensed_first");
-  std::ofstream(first.name) << kHeading + rows(0, 2'000, 20);
-  const ToolRun run = runTool({"sense", first.name, "-", "--session", "a=PHYAC"}, kHeading + rows(7'000, 8'000, 20));
+  std::ofstream(first.name) << kHeading + rows(0, 2'600, 20);
+  const ToolRun run = runTool({"sense", first.name, "-", "--session", "a=PHYAC"}, kHeading + rows(7'000, 9'800, 20));
+  EXPECT_EQ(linesWith(run.out, "dispatch"), 2U);
   EXPECT_NE(run.out.find(R"("timestamp":2560)"), std::string::npos);
+  EXPECT_NE(run.out.find(R"("timestamp":6140)"), std::string::npos);
   EXPECT_EQ(run.err, "");
 }
 
@@ -236,6 +238,18 @@ TEST(Sense, RefusesWhatCannotBeAskedFor) {
   }
   EXPECT_EQ(runTool({"sense", "/no/such/file", "--session", "a=PHYAC"}).err,
             "senseloom: /no/such/file: No such file or directory\n");
+}
+
+// The same file for both word sizes: they decide the same.
+TEST(Sense, MakesTheTraceAndThePictureOfTheDemo) {
+  const ScratchFile picture("sensed_demo");
+  const ToolRun run =
+      runTool({"sense", "../data/activity/continuous_09_person5.csv.gz", "../data/demo/digit_3.csv.gz", "--session",
+               R"(nav=PHYAC:{"mode":1,"logN":3,"weightVar":2})", "--session", R"(fitness=SCOUN:{"mode":0,"logN":1})",
+               "--session", "dial=GSPX", "--plot", picture.name, "--class-names", "unknown,still,on foot,3"});
+  EXPECT_EQ(run.err, "senseloom: ../data/demo/digit_3.csv.gz: 52.6 samples a second become 50\n");
+  EXPECT_TRUE(run.out == contentOf(GOLDEN_FOLDER "/sense/demo.jsonl"));
+  EXPECT_TRUE(contentOf(picture.name) == contentOf(EXAMPLES_FOLDER "/../docs/stairs.svg"));
 }
 
 TEST(Sense, WritesOverNoRecording) {

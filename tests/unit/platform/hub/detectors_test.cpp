@@ -152,8 +152,8 @@ TEST(MovementFinder, HandsOverWhatIsBetweenTwoStills) {
 }
 
 TEST(MovementFinder, KeepsAPauseWithinADrawing) {
-  EXPECT_EQ(movementsIn({.moving = 60, .pause = 50, .movingAgain = 60}).size(), 1U);
-  EXPECT_EQ(movementsIn({.moving = 60, .pause = 80, .movingAgain = 60}).size(), 2U);
+  EXPECT_EQ(movementsIn({.moving = 60, .pause = 65, .movingAgain = 60}).size(), 1U);
+  EXPECT_EQ(movementsIn({.moving = 60, .pause = 90, .movingAgain = 60}).size(), 2U);
 }
 
 TEST(MovementFinder, LeavesOutWhatIsTooShortOrTooLong) {
