@@ -15,8 +15,11 @@ namespace {
 constexpr struct {
   const char* name;
   void (*run)(const uint8_t* data, size_t size);
-} kTargets[] = {
-    {"options", fuzz::options}, {"records", fuzz::records}, {"sequences", fuzz::sequences}, {"gesture", fuzz::gesture}};
+} kTargets[] = {{"options", fuzz::options},
+                {"records", fuzz::records},
+                {"sequences", fuzz::sequences},
+                {"gesture", fuzz::gesture},
+                {"hub", fuzz::hub}};
 
 std::vector<std::filesystem::path> filesOf(const std::vector<std::filesystem::path>& paths) {
   std::vector<std::filesystem::path> files;
@@ -40,7 +43,7 @@ int main(int argc, char** argv) {
   });
   const auto files = arguments.empty() ? filesOf({}) : filesOf({arguments.begin() + 1, arguments.end()});
   if (target == std::end(kTargets) || files.empty()) {
-    std::fputs("usage: replay_corpus options|records|sequences|gesture PATH...\n", stderr);
+    std::fputs("usage: replay_corpus options|records|sequences|gesture|hub PATH...\n", stderr);
     return 2;
   }
   for (const auto& file : files) {

@@ -11,7 +11,7 @@ seconds=$1
 programs=$2/fuzz
 sources=$(cd "$(dirname "$0")" && pwd)
 
-for target in options records sequences gesture; do
+for target in options records sequences gesture hub; do
   echo "== $target"
   mkdir -p "$programs/found/$target"
   "$programs/fuzz_$target" -max_total_time="$seconds" -max_len=4096 -timeout=10 -print_final_stats=1 \

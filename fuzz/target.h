@@ -16,6 +16,7 @@ void options(const uint8_t* data, size_t size);
 void records(const uint8_t* data, size_t size);
 void sequences(const uint8_t* data, size_t size);
 void gesture(const uint8_t* data, size_t size);
+void hub(const uint8_t* data, size_t size);
 
 inline oracle::Call openCall(int session, int sensor) {
   oracle::Call call;

@@ -1,5 +1,7 @@
 #include "dead_reckoning_sensor.h"
 
+#include <algorithm>
+
 #include "resampler.h"
 #include "rotation.h"
 
@@ -41,8 +43,8 @@ void DeadReckoningSensor::configure(Properties properties) {
   const auto given = [&](std::int32_t id, std::int32_t notGiven, std::int32_t otherwise) {
     return orElse(integerOf(properties, id, notGiven), notGiven, otherwise);
   };
-  stepLength = given(kUserHeight, kNoUserHeight, kUsualUserHeight) * 10 * kStepThousandths / 1'000;
-  floorHeight = given(kFloorHeight, kNoFloorHeight, kUsualFloorHeight) * 10;
+  stepLength = std::int64_t{given(kUserHeight, kNoUserHeight, kUsualUserHeight)} * 10 * kStepThousandths / 1'000;
+  floorHeight = std::max<std::int64_t>(std::int64_t{given(kFloorHeight, kNoFloorHeight, kUsualFloorHeight)} * 10, 1);
   hasHeading = integerOf(properties, kSixAxes, 1) != 0;
   if (isConfigured) return;  // whoever walks does not start anew for another list
   isConfigured = true;
@@ -90,7 +92,8 @@ void DeadReckoningSensor::climb(std::int32_t pressure) {
   pressures.add(pressure);
   if (!pressures.isFull()) return;
   if (!firstPressure) firstPressure = pressures.mean();
-  floor = firstFloor + quotient((*firstPressure - pressures.mean()) * kHeightOfPascal, floorHeight);
+  const std::int64_t higher = quotient((*firstPressure - pressures.mean()) * kHeightOfPascal, floorHeight);
+  floor = static_cast<std::int32_t>(firstFloor + higher);
 }
 
 void DeadReckoningSensor::walk(std::int64_t headingThen) {
