@@ -107,7 +107,7 @@ void fuzz::hub(const std::uint8_t* data, std::size_t size) {
         time += input.take<std::int32_t>();
         requireLayout(hub.take(sampleAt(time, input)));
         break;
-      default:  // the same for a while, to and fro
+      default:  // the same for a while, back and forth
         const hub::Sample sample = sampleAt(time, input);
         for (int i = 0; i < 200; ++i) {
           hub::Sample next = sample;

@@ -3,12 +3,12 @@
 
     scripts/learn_activity.py [FOLDER] >platform/hub/activity_model.inc
 
-FOLDER has recordings of people whose activities are known, as gzipped tables with a heading: NAME_personNUMBER.csv.gz, with
-a sample each 20 ms; the default is data/activity. What is learned are limits of the variance of the acceleration's magnitude
-within a window. The limit between two activities is the geometric mean of a high quantile of the lower and a low quantile of
-the higher. What is beyond these is left to chance: people who sit and take the phone into their hand, and above all those
-who stop at a door while their recording says that they walk. All arithmetic is in integers, and the same as the hub's, in platform/hub/resampler.cpp and
-activity_classifier.cpp. Needs Debian's python3-numpy.
+FOLDER has recordings of people whose activities are known, as gzipped tables with a heading: NAME_personNUMBER.csv.gz,
+with a sample each 20 ms; the default is data/activity. What is learned are limits of the variance of the acceleration's
+magnitude within a window. The limit between two activities is the geometric mean of a high quantile of the lower and a
+low quantile of the higher. What is beyond these is left to chance: people who sit and take the phone into their hand,
+and above all those who stop on a landing while their recording says that they climb. All arithmetic is in integers, and
+the same as the hub's, in platform/hub/resampler.cpp and activity_classifier.cpp. Needs Debian's python3-numpy.
 """
 
 import gzip

@@ -51,6 +51,8 @@ def leave_one_out(build, people):
     counts, least = collections.Counter(), 1.0
     for person, paths in people.items():
         others = [pair for other, pairs in windows.items() if other != person for pair in pairs]
+        if not {activity for _, activities in others for activity in activities.tolist()} >= NAMES.keys():
+            continue  # nobody to learn from
         limits = learn_activity.limits_of(*(np.concatenate(values) for values in zip(*others)))
         own = collections.Counter()
         add_decisions(own, sensed(build, paths, limits))
@@ -86,14 +88,16 @@ def activity_table(build, folder):
     print(f"\n| Classifier learned from | People | Window | Decisions | {' | '.join(NAMES.values())} | All right |")
     print("| --- | --: | --: | --: | --: | --: | --: | --: |")
     counts, least = leave_one_out(build, people)
-    activity_row("everybody else there", len(people), counts)
+    if counts:
+        activity_row("everybody else there", len(people), counts)
     known = {person_of(path) for path in (REPOSITORY / "data/activity").glob("*_person*.csv.gz")}
     strangers = {person: paths for person, paths in people.items() if person not in known}
     if strangers:
         own = collections.Counter()
         add_decisions(own, sensed(build, [path for paths in strangers.values() for path in paths], built_limits()))
         activity_row("data/, as it is built", len(strangers), own)
-    print(f"\nOf one person alone, at least {100 * least:.1f} % are right (window of 2.56 s).")
+    if counts:
+        print(f"\nOf one person alone, at least {100 * least:.1f} % are right (window of 2.56 s).")
     quiet_table(sensed(build, [path for paths in people.values() for path in paths], built_limits()))
 
 

@@ -218,7 +218,7 @@ TEST(Sense, RefusesWhatCannotBeAskedFor) {
   } cases[] = {
       {{"--session", "tap=STAP"},
        "the hub cannot sense STAP: taps last a few milliseconds, less than lies between two samples"},
-      {{"--session", "a=NONE"}, "unknown sensor \"NONE\": `senseloom sensors` prints those that are known"},
+      {{"--session", "a=NONE"}, "unknown sensor \"NONE\": the nearest is \"STAP\"; `senseloom sensors` prints all"},
       {{"--session", "PHYAC"}, "--session PHYAC: must be NAME=SENSOR or NAME=SENSOR:OPTION"},
       {{"--session", "a=PHYAC", "--session", "a=SCOUN"}, "session \"a\" is already open"},
       {{"--session", "a=PHYAC:{"}, "the library refuses the option of session \"a\": {"},

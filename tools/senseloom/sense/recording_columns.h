@@ -21,9 +21,8 @@ struct RecordingColumns {
   double factorOf(Quantity quantity) const { return factors[static_cast<size_t>(quantity)]; }
 };
 
-// Those of data/ ("mm": ms, mm/s², mrad/s, Pa) or of SI ("si": s, m/s², rad/s, hPa), with the names that `columns` says
-// otherwise, such as "time=seconds,ax=x"; empty: none. `timeUnit` is s, ms, us or ns, or empty for that of the units.
-// Throws InputError.
+// Those of data/ ("mm": ms, mm/s², mrad/s, Pa) or of SI ("si": s, m/s², rad/s, hPa), with other names as `columns` says,
+// such as "time=seconds,ax=x". `timeUnit` is s, ms, us or ns, or empty for that of the units. Throws InputError.
 RecordingColumns recordingColumns(const std::string& units, const std::string& columns, const std::string& timeUnit);
 
 }  // namespace senseloom::tool

@@ -38,14 +38,19 @@ void addRecordingOptions(CLI::App& command, TypedSensing& typed) {
   command
       .add_option("RECORDING", typed.sensing.recordings,
                   "the recordings, one after another; - is standard input. Plain or compressed by gzip")
-      ->required();
-  command.add_option("--units", typed.units, "of the columns: mm (ms, mm/s², mrad/s, Pa) or si (s, m/s², rad/s, hPa)")
+      ->required()
+      ->type_name("FILE");
+  command.add_option("--units", typed.units, "of the columns: ms, mm/s^2, mrad/s and Pa, or s, m/s^2, rad/s and hPa")
+      ->type_name("UNITS:{mm,si}")
       ->capture_default_str();
-  command.add_option("--columns", typed.columns,
-                     "the names of columns, as in time=seconds,ax=x,ay=y,az=z; there are gx, gy, gz, pressure and "
-                     "class, too");
-  command.add_option("--time-unit", typed.timeUnit, "of the times, if it is another: s, ms, us or ns");
+  command
+      .add_option(
+          "--columns", typed.columns,
+          "the names of columns, as in time=seconds,ax=x,ay=y,az=z; there are gx, gy, gz, pressure and class, too")
+      ->type_name("COLUMNS");
+  command.add_option("--time-unit", typed.timeUnit, "of the times, if it is another")->type_name("UNIT:{s,ms,us,ns}");
   command.add_option("--labels", typed.labels, "the class of a label in the column \"class\", if it is another")
+      ->type_name("LABELS")
       ->capture_default_str();
 }
 
@@ -56,9 +61,9 @@ void declareSense(CLI::App& app, Action& action) {
       app.add_subcommand("sense", "Sense from a recording of a phone's sensors, and write the trace of what happens.");
   command->footer(
       "A recording is a table with a heading: the time, the acceleration and, for GSPX, DTWGS and PDR, the angular "
-      "rate\n"
+      "rate "
       "(columns t_ms,ax_mm_s2,ay_mm_s2,az_mm_s2,gx_mrad_s,gy_mrad_s,gz_mrad_s), 20 to 200 samples a second. A sensor "
-      "hub\n"
+      "hub "
       "makes records of it, as the clients' options ask for together. The library passes them to the clients.\n"
       "Exit status: 0; 1 when the output cannot be written; 2 for bad input.");
   auto typed = std::make_shared<TypedSensing>();
@@ -67,13 +72,17 @@ void declareSense(CLI::App& app, Action& action) {
       ->add_option("--session", typed->sessions,
                    "a client: NAME=SENSOR or NAME=SENSOR:OPTION, as in 'nav=PHYAC:{\"mode\":1,\"logN\":3}'")
       ->required()
+      ->type_name("CLIENT")
       ->allow_extra_args(false);
   command
-      ->add_option("--at", typed->changes,
-                   "TIME NAME OPTION: at that time of the recording, such as 30s, the client's option changes, or its "
-                   "session is closed if OPTION is close")
+      ->add_option(
+          "--at", typed->changes,
+          "at that time of the recording, such as 30s, the client's option changes, or its session is closed if "
+          "OPTION is close")
+      ->type_name("TIME NAME OPTION")
       ->allow_extra_args(false);
-  command->add_option("-o,--output", typed->sensing.output, "the trace; else it is written to standard output");
+  command->add_option("-o,--output", typed->sensing.output, "the trace; else it is written to standard output")
+      ->type_name("FILE");
   addPlotOptions(*command, typed->sensing.plot);
   command->callback([typed, &action] { action = [typed](std::FILE* out) { senseAsTyped(out, *typed); }; });
 }
