@@ -53,7 +53,7 @@ const SensorRow& rowOf(std::string_view sensor) {
   const auto* const row = std::ranges::find(kSensors, sensor, &SensorRow::name);
   if (row != std::end(kSensors)) return *row;
   const auto* const refused = std::ranges::find(kRefused, sensor, &RefusedRow::name);
-  const char* const reason = refused != std::end(kRefused) ? refused->reason : "there is no such sensor";
+  const char* const reason = refused != std::end(kRefused) ? refused->reason : "it was not made for that";
   throw Refused("the hub cannot sense " + std::string(sensor) + ": " + reason);
 }
 

@@ -53,6 +53,7 @@ class Project:
             (folder / name).symlink_to(source / name)
         self.program("scripts/install-deps.sh", "#!/bin/sh\n")
         self.program("scripts/host-presets.sh", "#!/bin/sh\necho x86\n")
+        self.program("scripts/demo.sh", (source / "scripts/demo.sh").read_text())
         self.program("stand_in/cmake", CMAKE.format(cmake=shutil.which("cmake")))
         (folder / "build").mkdir()
         (folder / "build/x86").symlink_to(build)

@@ -240,6 +240,37 @@ TEST(Sense, RefusesWhatCannotBeAskedFor) {
             "senseloom: /no/such/file: No such file or directory\n");
 }
 
+TEST(Sense, HandsATemplateToAClientThatGivesItBackToMatch) {
+  const std::string drawing = "../data/demo/digit_3.csv.gz";
+  const std::string enrolled = sense("", {"--session", R"(pen=DTWGS:{"mode":1,"classMask":1})"}, drawing).out;
+  const std::string hex = R"("record":{"hex":")";
+  const size_t record = enrolled.find(hex);
+  ASSERT_NE(record, std::string::npos) << enrolled;
+  const size_t text = record + hex.size() + 20;  // behind the timestamp and the classes
+  const std::string given = enrolled.substr(text, enrolled.find('"', text) - text);
+  EXPECT_EQ(given.substr(0, 4), "0090");
+  EXPECT_EQ(given.size(), 4U + 2 * 144);
+
+  const std::string option = R"({"mode":4,"classMask":3,"level":0,"template2":")" + given + "\"}";
+  const std::string matched = sense("", {"--session", "pen=DTWGS:" + option}, drawing).out;
+  EXPECT_NE(matched.find("0200\"}"), std::string::npos) << matched;
+  const std::string walk =
+      sense("", {"--session", "pen=DTWGS:" + option}, "../data/activity/continuous_09_person5.csv.gz").out;
+  EXPECT_EQ(walk.find("dispatch"), std::string::npos);
+  EXPECT_EQ(sense("", {"--session", R"(pen=DTWGS:{"mode":4,"classMask":1,"template1":"000101"})"}, drawing).err,
+            "senseloom: ../data/demo/digit_3.csv.gz: 52.6 samples a second become 50\n"
+            "senseloom: session \"pen\": the template is not one that the hub enrolled\n");
+}
+
+TEST(Sense, WalksForClientsOfDeadReckoning) {
+  const ToolRun run = sense(
+      "",
+      {"--session", R"(way=PDR:{"userHeight":180,"floorHeight":300,"initX":0,"initY":0,"initFloor":1,"6DOF":1,"N":3})"},
+      "../data/activity/continuous_09_person5.csv.gz");
+  EXPECT_GE(linesWith(run.out, R"({"call":"dispatch","sensor":"PDR","record":{"timestamp":)"), 100U);
+  EXPECT_EQ(run.status, 0);
+}
+
 // The same file for both word sizes: they decide the same.
 TEST(Sense, MakesTheTraceAndThePictureOfTheDemo) {
   const ScratchFile picture("sensed_demo");
