@@ -78,8 +78,9 @@ void Hub::stop(std::string_view sensor) {
 
 Records Hub::take(const Sample& sample) {
   const Resampler::Taken taken = resampler.take(sample);
-  time = sample.time;
   Records records;
+  if (taken.startedOver) records = finish();
+  time = sample.time;
   for (auto& [name, sensor] : sensors) {
     if (taken.startedOver) sensor->startOver();
     for (const Sample& interval : taken.intervals) sensor->take(interval, records);

@@ -68,9 +68,9 @@ class Sensor {
   virtual void configure(Properties properties) = 0;
   // Takes the next of the samples that are kInterval apart, and adds the records that it makes.
   virtual void take(const Sample& sample, Records& records) = 0;
-  // There is a gap before the next sample.
+  // There is a gap before the next sample; what ends with that was finished.
   virtual void startOver() = 0;
-  // No more samples come.
+  // No more samples come for now: adds the records of what ends with that.
   virtual void finish(std::int64_t /*time*/, Records& /*records*/) {}
 };
 

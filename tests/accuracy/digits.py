@@ -172,10 +172,13 @@ def windows_of(path, length):
 
 
 def movement_table(build, folder):
+    paths = sorted((folder / "activity").glob("*.csv.gz"))
+    fed = {length: [window for path in paths for window in windows_of(path, length)] for length in WINDOW_MS}
+    if not any(fed.values()):
+        return
     print("\n| Daily movement fed | Hours | Windows | Recognised | ms a window, 99 % within |")
     print("| --- | --: | --: | --: | --: |")
-    for length in WINDOW_MS:
-        windows = [window for path in sorted((folder / "activity").glob("*.csv.gz")) for window in windows_of(path, length)]
+    for length, windows in fed.items():
         found, times = recognise(build, windows)
         accepted = sum(answer is not None for answer in found)
         hours = len(windows) * HOP_MS / 3_600_000
@@ -188,5 +191,4 @@ def print_tables(build, folder):
             cross_validation_table(build, drawings_of(folder))
         else:
             built_engine_table(build, folder)
-    if any((folder / "activity").glob("*.csv.gz")):
-        movement_table(build, folder)
+    movement_table(build, folder)

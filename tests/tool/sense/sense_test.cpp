@@ -141,6 +141,20 @@ TEST(Sense, PutsRecordingsOneBehindTheOtherWithAGapOfASecond) {
   EXPECT_EQ(run.err, "");
 }
 
+TEST(Sense, TakesATableOfSeveralRecordingsApart) {
+  std::string table = "walk," + std::string(kHeading);
+  for (const std::string walk : {"a", "b"}) {
+    for (int time = 0; time < 2'700; time += 20) table += walk + ',' + row(time, swing(time));
+  }
+  const std::string out = sense(table, {"--session", "a=PHYAC", "--columns", "recording=walk"}).out;
+  EXPECT_EQ(linesWith(out, "dispatch"), 2U);
+  EXPECT_NE(out.find(R"("timestamp":6240)"), std::string::npos) << out;  // 2.56 s behind 2.68 s and a gap of 1 s
+  // Drawings have such a column. Each ends with its recording.
+  const std::string drawings = sense("", {"--session", "a=GSPX"}, "../data/digits/digit_7.csv.gz").out;
+  EXPECT_GE(linesWith(drawings, "dispatch"), 28U);
+  EXPECT_LE(linesWith(drawings, "dispatch"), 36U);
+}
+
 TEST(Sense, SaysWhatItMended) {
   const std::string name = "senseloom: standard input: ";
   EXPECT_EQ(sense(kHeading + row(0, 0) + row(20, 0) + rows(40, 3'000, 20)).err,
@@ -227,7 +241,7 @@ TEST(Sense, RefusesWhatCannotBeAskedFor) {
       {{"--session", "a=PHYAC", "--at", "9s", "a", "{}"}, "--at: the recording ends before the time for \"a\""},
       {{"--session", "a=PHYAC", "--columns", "x=ax"},
        "--columns x=ax: must be some of "
-       "time=NAME,ax=NAME,ay=NAME,az=NAME,gx=NAME,gy=NAME,gz=NAME,pressure=NAME,class=NAME"},
+       "time=NAME,ax=NAME,ay=NAME,az=NAME,gx=NAME,gy=NAME,gz=NAME,pressure=NAME,class=NAME,recording=NAME"},
       {{"--session", "a=PHYAC", "--units", "feet"}, "unknown units \"feet\": mm and si are known"},
       {{"--session", "a=PHYAC", "--labels", "5"}, "--labels 5: must be as in 4=1,5=2,7=2"},
   };

@@ -109,7 +109,7 @@ class RowReader {
 
   std::optional<size_t> placeOf(Quantity quantity) const { return places[static_cast<size_t>(quantity)]; }
 
-  Row rowOf(const std::string& line) const {
+  Row rowOf(const std::string& line) {
     const auto cells = cellsOf(line, separator);
     if (cells.size() != width) {
       throw InputError(std::to_string(cells.size()) + " cells in a table of " + std::to_string(width));
@@ -122,7 +122,15 @@ class RowReader {
     if (hasRate) row.sample.rate = axes(cells, Quantity::gx);
     if (placeOf(Quantity::pressure)) row.sample.pressure = integer(cells, Quantity::pressure);
     if (placeOf(Quantity::label)) row.label = integer(cells, Quantity::label);
+    if (placeOf(Quantity::part)) row.part = partNamed(cells[*placeOf(Quantity::part)]);
     return row;
+  }
+
+  // Another name than in the row before begins another part.
+  size_t partNamed(std::string_view name) {
+    if (name != partName) ++parts;
+    partName = name;
+    return parts;
   }
 
   hub::Axes axes(const std::vector<std::string_view>& cells, Quantity first) const {
@@ -157,6 +165,8 @@ class RowReader {
   size_t width = 0;
   std::array<std::optional<size_t>, kQuantities> places;
   bool hasRate = false;
+  size_t parts = 0;
+  std::string partName;
 };
 
 // Puts what was read into a form that a hub can take, and remembers what it had to do.
@@ -168,6 +178,7 @@ class Mender {
   }
 
   Recording mend() {
+    putPartsApart();
     leaveOutZeros();
     putInOrder();
     checkRate();
@@ -181,6 +192,17 @@ class Mender {
   }
 
   void remark(const std::string& text) { recording.remarks.push_back(name + ": " + text); }
+
+  void putPartsApart() {
+    auto& rows = recording.rows;
+    int64_t shift = 0;
+    int64_t latest = 0;
+    for (size_t i = 0; i < rows.size(); ++i) {
+      if (i > 0 && rows[i].part != rows[i - 1].part) shift = latest + kBetweenRecordings - rows[i].sample.time;
+      rows[i].sample.time += shift;
+      latest = std::max(latest, rows[i].sample.time);
+    }
+  }
 
   // Some phones deliver zeros until their sensors have begun. Not even a falling phone reads zero on all axes.
   void leaveOutZeros() {

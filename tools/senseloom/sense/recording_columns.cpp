@@ -27,6 +27,7 @@ constexpr std::array<QuantityRow, kQuantities> kRows{{
     {"gz", {"gz_mrad_s", "gz_rad_s"}, {1, 1000}},
     {"pressure", {"p_pa", "p_hpa"}, {1, 100}},
     {"class", {"class", "class"}, {1, 1}},
+    {"recording", {"drawing", "drawing"}, {1, 1}},
 }};
 
 void rename(RecordingColumns& columns, const std::string& text) {
@@ -39,7 +40,7 @@ void rename(RecordingColumns& columns, const std::string& text) {
     if (row == kRows.end() || equals == std::string::npos || equals + 1 == part.size()) {
       throw InputError("--columns " + text +
                        ": must be some of time=NAME,ax=NAME,ay=NAME,az=NAME,gx=NAME,gy=NAME,gz=NAME,pressure=NAME,"
-                       "class=NAME");
+                       "class=NAME,recording=NAME");
     }
     columns.names[static_cast<size_t>(row - kRows.begin())] = part.substr(equals + 1);
   }

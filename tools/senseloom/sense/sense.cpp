@@ -19,8 +19,6 @@
 namespace senseloom::tool {
 namespace {
 
-constexpr int64_t kBetween = 1'000'000;  // microseconds
-
 struct CloseFile {
   void operator()(std::FILE* file) const { std::fclose(file); }
 };
@@ -52,14 +50,15 @@ void checkSessions(const SensingArguments& arguments) {
   }
 }
 
-// The rows of all recordings. Nobody knows what happened between two of them: there is a gap, of a second.
+// The rows of all recordings, one after another.
 std::vector<Recording::Row> readAll(const SensingArguments& arguments) {
   const bool takesRate = needsRate(arguments.clients);
   std::vector<Recording::Row> rows;
   for (const std::string& file : arguments.recordings) {
     Recording recording = readRecording(file, arguments.columns, takesRate);
     for (const std::string& remark : recording.remarks) std::fprintf(stderr, "senseloom: %s\n", remark.c_str());
-    const int64_t shift = rows.empty() ? 0 : rows.back().sample.time + kBetween - recording.rows.front().sample.time;
+    const int64_t shift =
+        rows.empty() ? 0 : rows.back().sample.time + kBetweenRecordings - recording.rows.front().sample.time;
     for (Recording::Row& row : recording.rows) {
       row.sample.time += shift;
       rows.push_back(row);

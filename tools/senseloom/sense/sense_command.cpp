@@ -44,9 +44,9 @@ void addRecordingOptions(CLI::App& command, TypedSensing& typed) {
       ->type_name("UNITS:{mm,si}")
       ->capture_default_str();
   command
-      .add_option(
-          "--columns", typed.columns,
-          "the names of columns, as in time=seconds,ax=x,ay=y,az=z; there are gx, gy, gz, pressure and class, too")
+      .add_option("--columns", typed.columns,
+                  "the names of columns, as in time=seconds,ax=x,ay=y,az=z; there are gx, gy, gz, pressure, class and "
+                  "recording, too")
       ->type_name("COLUMNS");
   command.add_option("--time-unit", typed.timeUnit, "of the times, if it is another")->type_name("UNIT:{s,ms,us,ns}");
   command.add_option("--labels", typed.labels, "the class of a label in the column \"class\", if it is another")
