@@ -6,7 +6,7 @@
 # Somebody sits, gets up, walks to the stairs and climbs them; then somebody draws a digit.
 set -euo pipefail
 tool=$1
-data=$(dirname "$0")/../data
+data=$(realpath --relative-to=. "$(dirname "$0")/../data")
 "$tool" sense "$data/activity/continuous_09_person5.csv.gz" "$data/demo/digit_3.csv.gz" \
   --session 'nav=PHYAC:{"mode":1,"logN":3,"weightVar":2}' \
   --session 'fitness=SCOUN:{"mode":0,"logN":1}' \

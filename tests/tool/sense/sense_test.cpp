@@ -4,6 +4,7 @@
 #include <cstdlib>
 #include <fstream>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "recording.h"
@@ -41,7 +42,8 @@ size_t linesWith(const std::string& text, const std::string& part) {
   return count;
 }
 
-constexpr char kStart[] = R"({"note":"sensed from -","timeUnit":"ms"}
+constexpr char kStart[] =
+    R"({"note":"sensed from -","timeUnit":"ms","classNames":["unknown","still","on foot","running"]}
 {"call":"open","session":"a","sensor":"PHYAC"}
 {"call":"set_option","session":"a","option":{}}
 )";
@@ -301,9 +303,11 @@ TEST(Sense, WritesOverNoRecording) {
   const ScratchFile recording("sensed_recording");
   const std::string table = kHeading + rows(0, 3'000, 20);
   std::ofstream(recording.name) << table;
-  for (const std::string option : {"-o", "--plot"}) {
+  const std::pair<std::string, std::string> refusals[] = {{"-o", "holds something already"},
+                                                          {"--plot", "is one of the recordings"}};
+  for (const auto& [option, refusal] : refusals) {
     const ToolRun run = sense("", {"--session", "a=PHYAC", option, recording.name}, recording.name);
-    EXPECT_EQ(run.err, "senseloom: " + recording.name + " is one of the recordings, and would be written over\n");
+    EXPECT_EQ(run.err, "senseloom: " + recording.name + ": " + refusal + '\n');
     EXPECT_EQ(run.status, 2);
     EXPECT_EQ(contentOf(recording.name), table);
   }

@@ -4,31 +4,32 @@
 #include <hub.h>
 
 #include <algorithm>
-#include <cerrno>
 #include <charconv>
-#include <cstring>
 #include <filesystem>
-#include <memory>
-#include <stdexcept>
+#include <string_view>
 
 #include "input_error.h"
 #include "sense/recording.h"
 #include "sense/sensing_run.h"
+#include "terminal/new_file.h"
 #include "trace/time_unit.h"
 
 namespace senseloom::tool {
 namespace {
 
-struct CloseFile {
-  void operator()(std::FILE* file) const { std::fclose(file); }
-};
+// Nothing of a user's is written over.
+void requireNew(const std::string& output) {
+  std::error_code error;
+  if (std::filesystem::is_regular_file(output, error) && std::filesystem::file_size(output, error) > 0) {
+    throw InputError(output + ": holds something already");
+  }
+}
 
-// Nothing that was given as input is written over.
-void requireOther(const std::string& output, const std::vector<std::string>& recordings) {
+void requireNoRecording(const std::string& picture, const std::vector<std::string>& recordings) {
   std::error_code error;
   for (const std::string& recording : recordings) {
-    if (!output.empty() && std::filesystem::equivalent(output, recording, error)) {
-      throw InputError(output + " is one of the recordings, and would be written over");
+    if (!picture.empty() && std::filesystem::equivalent(picture, recording, error)) {
+      throw InputError(picture + ": is one of the recordings");
     }
   }
 }
@@ -110,21 +111,18 @@ std::map<int32_t, int32_t> labelClasses(const std::string& text) {
 
 void sense(std::FILE* out, const SensingArguments& arguments) {
   __android_log_set_minimum_priority(ANDROID_LOG_WARN);  // not each negotiation
-  requireOther(arguments.output, arguments.recordings);
-  requireOther(arguments.plot.file, arguments.recordings);
+  requireNew(arguments.output);
+  requireNoRecording(arguments.plot.file, arguments.recordings);
   checkSessions(arguments);
   const auto rows = readAll(arguments);
-  std::unique_ptr<std::FILE, CloseFile> file;
-  if (!arguments.output.empty()) {
-    file.reset(std::fopen(arguments.output.c_str(), "w"));
-    if (file == nullptr) throw std::runtime_error(arguments.output + ": cannot be written: " + std::strerror(errno));
+  if (arguments.output.empty()) {
+    SensingRun([out](std::string_view line) { std::fwrite(line.data(), 1, line.size(), out); }, arguments).run(rows);
+    return;
   }
-  SensingRun(file ? file.get() : out, arguments).run(rows);
-  if (!file) return;
-  const bool isWritten = std::ferror(file.get()) == 0;
-  if (std::fclose(file.release()) != 0 || !isWritten) {
-    throw std::runtime_error(arguments.output + ": cannot be written: " + std::strerror(errno));
-  }
+  constexpr mode_t kOwnerAlone = 0600;  // a trace holds what the sensors saw
+  NewFile file(arguments.output, kOwnerAlone, NewFile::Rest::removed);
+  SensingRun([&file](std::string_view line) { file.write(line); }, arguments).run(rows);
+  file.commit();
 }
 
 }  // namespace senseloom::tool

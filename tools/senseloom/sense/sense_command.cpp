@@ -7,7 +7,7 @@
 #include <tuple>
 #include <vector>
 
-#include "plot/plot_options.h"
+#include "command_line/call_options.h"
 #include "sense/sense.h"
 
 namespace senseloom::tool {

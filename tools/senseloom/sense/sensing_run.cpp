@@ -4,6 +4,9 @@
 #include <utility>
 
 #include "input_error.h"
+#include "plot/picture_file.h"
+#include "plot/svg_picture.h"
+#include "trace/class_names.h"
 #include "trace/hex.h"
 #include "trace/record_codec.h"
 #include "trace/trace_form.h"
@@ -13,10 +16,6 @@ namespace {
 
 constexpr char kClose[] = "close";
 
-class NoOutput final : public ReplayObserver {
-  void onOutcome(const CallOutcome&) override {}
-};
-
 Json text(const std::string& value) {
   return Json(json_string(value.c_str()));
 }
@@ -24,7 +23,7 @@ Json text(const std::string& value) {
 // By its fields, if they say all that it holds.
 Json recordJson(const Sensor& sensor, const hub::Record& record) {
   const bool isWhole = sensor.items != Items::samples && sensor.bytesProperty < 0;
-  if (isWhole) return decodeResult(sensor, record.bytes);
+  if (isWhole) return decodeRecord(sensor, record.bytes);
   Json bytes(json_object());
   addMember(bytes, member::kHex, text(toHex(record.bytes)));
   return bytes;
@@ -43,11 +42,12 @@ Json callLine(CallKind kind) {
 
 }  // namespace
 
-SensingRun::SensingRun(std::FILE* stream, const SensingArguments& given)
-    : out(stream),
-      arguments(given),
-      listener(withPlot(std::make_unique<NoOutput>(), given.recordings.front(), given.plot)),
-      replayer(*this) {}
+SensingRun::SensingRun(Write toTrace, const SensingArguments& given)
+    : writeLine(std::move(toTrace)), arguments(given), replayer(*this) {
+  if (arguments.plot.file.empty()) return;
+  requireWritable(arguments.plot.file);
+  plot.emplace();
+}
 
 void SensingRun::run(const std::vector<Recording::Row>& rows) {
   start();
@@ -62,7 +62,10 @@ void SensingRun::run(const std::vector<Recording::Row>& rows) {
   for (const hub::Record& record : hub.finish()) dispatch(record, rows.back().label);
   if (next != changes.end()) throw InputError("--at: the recording ends before the time for \"" + next->session + '"');
   while (!open.empty()) close(open.front());
-  listener->onEnd();
+  if (!plot) return;
+  const ClassNames names =
+      arguments.plot.classNames.empty() ? namesOfClasses() : readClassNames(arguments.plot.classNames);
+  writePicture(arguments.plot.file, drawSvg(*plot, traceTitle(arguments.recordings.front()), names));
 }
 
 void SensingRun::start() {
@@ -71,6 +74,9 @@ void SensingRun::start() {
   for (const std::string& recording : arguments.recordings) sources += (sources.empty() ? "" : ", ") + recording;
   addMember(line, member::kNote, text("sensed from " + sources));
   addMember(line, member::kTimeUnit, text("ms"));
+  Json names(json_array());
+  for (const std::string& name : namesOfClasses()) json_array_append_new(names.get(), text(name).release());
+  if (json_array_size(names.get()) > 0) addMember(line, member::kClassNames, std::move(names));
   write(line);
   for (const SensingClient& client : arguments.clients) {
     Json opening = callLine(CallKind::open);
@@ -84,6 +90,13 @@ void SensingRun::start() {
     open.push_back(client.name);
     setOption(client.name, client.option);
   }
+}
+
+// Those of activities, unless there are sensors with other classes, too.
+ClassNames SensingRun::namesOfClasses() const {
+  const bool areActivities =
+      std::ranges::all_of(arguments.clients, [](const SensingClient& client) { return hasActivities(*client.sensor); });
+  return areActivities ? ClassNames{"unknown", "still", "on foot", "running"} : ClassNames{};
 }
 
 void SensingRun::change(const SensingChange& wanted) {
@@ -132,7 +145,7 @@ void SensingRun::dispatch(const hub::Record& record, int32_t label) {
 }
 
 void SensingRun::write(const Json& line) {
-  std::fprintf(out, "%s\n", compactText(line.get()).c_str());
+  writeLine(compactText(line.get()) + '\n');
   ++lines;
 }
 
@@ -157,7 +170,7 @@ void SensingRun::onOutcome(const CallOutcome& outcome) {
       throw InputError("session \"" + outcome.session + "\": " + refused.what());
     }
   }
-  listener->onOutcome(outcome);
+  if (plot) plot->onOutcome(outcome);
 }
 
 }  // namespace senseloom::tool

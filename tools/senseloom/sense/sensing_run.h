@@ -3,13 +3,16 @@
 #include <hub.h>
 
 #include <cstddef>
-#include <cstdio>
-#include <memory>
+#include <functional>
+#include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
+#include "plot/plot.h"
 #include "sense/recording.h"
 #include "sense/sense.h"
+#include "trace/class_names.h"
 #include "trace/json.h"
 #include "trace/replayer.h"
 
@@ -19,13 +22,17 @@ namespace senseloom::tool {
 // that the library hands out, and the library the records that the hub makes.
 class SensingRun final : private ReplayObserver {
  public:
-  SensingRun(std::FILE* stream, const SensingArguments& given);
+  // Takes a line of the trace, with its line feed.
+  using Write = std::function<void(std::string_view line)>;
+
+  SensingRun(Write toTrace, const SensingArguments& given);
 
   // Throws InputError.
   void run(const std::vector<Recording::Row>& rows);
 
  private:
   void start();
+  ClassNames namesOfClasses() const;
   void change(const SensingChange& wanted);
   void dispatch(const hub::Record& record, int32_t label);
   void setOption(const std::string& session, const std::string& option);
@@ -34,10 +41,10 @@ class SensingRun final : private ReplayObserver {
   void perform(TraceCall call, const Json& line);
   void onOutcome(const CallOutcome& outcome) override;
 
-  std::FILE* const out;
+  const Write writeLine;
   const SensingArguments& arguments;
   hub::Hub hub;
-  std::unique_ptr<ReplayObserver> listener;  // a picture, if one is wanted
+  std::optional<Plot> plot;  // if a picture is wanted
   Replayer replayer;
   size_t lines = 0;               // of the trace so far
   std::vector<std::string> open;  // the sessions that are, in the order of their opening

@@ -1,36 +1,33 @@
 #include "sense/text_lines.h"
 
-#include <unistd.h>
-
-#include <array>
-#include <cerrno>
-#include <cstring>
+#include <algorithm>
 
 #include "input_error.h"
 
 namespace senseloom::tool {
 
-TextLines::TextLines(const std::string& file)
-    : name(file == "-" ? "standard input" : file),
-      stream(file == "-" ? gzdopen(dup(STDIN_FILENO), "rb") : gzopen(file.c_str(), "rb")) {
-  if (stream == nullptr) throw InputError(name + ": " + std::strerror(errno));
+TextLines::TextLines(const std::string& file) : name(file == "-" ? "standard input" : file), buffer() {
+  try {
+    stream = openBytes(file);
+  } catch (const InputError& error) {
+    throw InputError(name + ": " + error.what());
+  }
 }
 
 bool TextLines::next(std::string& line) {
   line.clear();
-  std::array<char, 4096> part;
-  while (gzgets(stream.get(), part.data(), part.size()) != nullptr) {
-    line += part.data();
-    if (line.ends_with('\n')) break;
+  bool isWhole = false;
+  while (!isWhole) {
+    if (rest.empty()) rest = {buffer.data(), stream->read(buffer.data(), buffer.size())};
+    if (rest.empty()) break;
+    const size_t end = std::min(rest.find('\n'), rest.size());
+    isWhole = end < rest.size();
+    line += rest.substr(0, end);
+    rest.remove_prefix(isWhole ? end + 1 : end);
   }
-  int error = Z_OK;
-  const char* const reason = gzerror(stream.get(), &error);
-  if (error != Z_OK && error != Z_STREAM_END) {
-    throw InputError(name + ": " + (error == Z_ERRNO ? std::strerror(errno) : reason));
-  }
-  if (line.empty()) return false;
+  if (!isWhole && line.empty()) return false;
   ++number;
-  while (line.ends_with('\n') || line.ends_with('\r')) line.pop_back();
+  if (line.ends_with('\r')) line.pop_back();
   return true;
 }
 

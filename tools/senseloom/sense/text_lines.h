@@ -1,18 +1,19 @@
 #pragma once
 
-#include <zlib.h>
-
+#include <array>
 #include <cstddef>
 #include <memory>
 #include <string>
-#include <type_traits>
+#include <string_view>
+
+#include "trace/byte_stream.h"
 
 namespace senseloom::tool {
 
-// Reads a text a line at a time, from a file or standard input, plain or compressed by gzip.
+// Reads a text a line at a time, from a file or standard input, plain or compressed.
 class TextLines {
  public:
-  // "-" is standard input. Throws InputError when the file cannot be opened.
+  // "-" is standard input. Throws InputError, with the name, when the file cannot be opened.
   explicit TextLines(const std::string& file);
 
   // Reads the next line, without its end. False at the end of the text. Throws InputError when it cannot be read.
@@ -24,12 +25,10 @@ class TextLines {
   size_t lineNumber() const { return number; }
 
  private:
-  struct Close {
-    void operator()(gzFile file) const { gzclose(file); }
-  };
-
   const std::string name;
-  std::unique_ptr<std::remove_pointer_t<gzFile>, Close> stream;
+  std::unique_ptr<ByteStream> stream;
+  std::array<char, 16384> buffer;
+  std::string_view rest;  // of the buffer
   size_t number = 0;
 };
 
