@@ -8,7 +8,7 @@ set -euo pipefail
 # Per task: packages that are programs or headers, and libraries, which 32-bit x86 needs in its own version, too.
 declare -A programs=(
   [build]="g++ cmake ninja-build libcli11-dev zlib1g-dev"
-  [test]="abigail-tools binutils chromium chromium-driver clang clang-13 doxygen dpkg-dev file fish fonts-dejavu-core groff-base libc++-dev libc++abi-dev lintian lld locales pkg-config python3 python3-jsonschema python3-numpy python3-pandas valgrind zsh"
+  [test]="abigail-tools binutils chromium chromium-driver clang clang-13 doxygen dpkg-dev file fish fonts-dejavu-core groff-base libc++-dev libc++abi-dev librsvg2-bin lintian lld locales pkg-config python3 python3-jsonschema python3-numpy python3-pandas valgrind zsh"
   [packages]="dpkg-dev lintian mmdebstrap python3"
   [bench]="libboost-dev librange-v3-dev"
   [fuzz]="clang libclang-rt-14-dev" # brings the runtime libraries of both word sizes

@@ -29,7 +29,7 @@ TEST(PlotLane, JoinsEachTwoBins) {
   lane.at(7).asks = true;
   lane.at(6).isRefused = true;
   lane.at(0).negotiates = true;
-  lane.addNote(7, "note");
+  lane.addNote(7, {.text = "note"});
   lane.at(Timeline::kBins).presence = PlotLane::Presence::closes;
   lane.fold();
   EXPECT_EQ(lane.at(2).received.records, 2U);
@@ -46,7 +46,7 @@ TEST(PlotLane, JoinsEachTwoBins) {
 
 TEST(PlotLane, KeepsABoundedNumberOfNotes) {
   PlotLane lane("a");
-  for (size_t i = 0; i < 1000; ++i) lane.addNote(i, "note");
+  for (size_t i = 0; i < 1000; ++i) lane.addNote(i, {.text = "note"});
   EXPECT_EQ(lane.allNotes().size(), 64U);
 }
 

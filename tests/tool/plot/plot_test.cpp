@@ -2,10 +2,12 @@
 #include <unistd.h>
 
 #include <cstdio>
+#include <filesystem>
 #include <fstream>
 #include <string>
 
 #include "recording.h"
+#include "run_tool.h"
 
 namespace senseloom::tool {
 namespace {
@@ -33,10 +35,16 @@ size_t countOf(const std::string& part, const std::string& text) {
 }
 
 TEST_F(PlotOf, TheCommuteIsThePictureInTheDocumentation) {
-  const ToolRun run = runTool({"replay", "--quiet", "--plot", file, "--class-names",
-                               "unknown,sitting,walking,running,cycling,riding,no majority", "commute.jsonl"});
-  EXPECT_EQ(run.status, 0);
-  EXPECT_TRUE(contentOf(file) == contentOf(EXAMPLES_FOLDER "/../docs/commute.svg"));
+  const std::string names = "unknown,sitting,walking,running,cycling,riding,no majority";
+  const std::string picture = contentOf(EXAMPLES_FOLDER "/../docs/commute.svg");
+  EXPECT_EQ(runTool({"explain", "commute.jsonl", "--plot", file, "--class-names", names}).status, 0);
+  EXPECT_TRUE(contentOf(file) == picture);
+  EXPECT_NE(contentOf(EXAMPLES_FOLDER "/../README.md")
+                .find("\n    senseloom explain examples/commute.jsonl --plot /tmp/commute.svg --class-names \"" +
+                      names + "\"\n"),
+            std::string::npos);
+  EXPECT_EQ(runTool({"replay", "--quiet", "--plot", file, "--class-names", names, "commute.jsonl"}).status, 0);
+  EXPECT_TRUE(contentOf(file) == picture);
   EXPECT_EQ(runTool({"explain", "--plot", file, "commute.jsonl"}).status, 0);
   EXPECT_NE(contentOf(file).find(">class 2</text>"), std::string::npos);
 }
@@ -92,16 +100,83 @@ TEST_F(PlotOf, ThousandsOfRecordsIsOfABoundedSize) {
   EXPECT_LT(plot(trace).size(), 300000U);
 }
 
-TEST_F(PlotOf, ManyClientsShowsTheFirst) {
+std::string traceOfClients(int count) {
   std::string trace;
-  for (int i = 0; i < 30; ++i) {
+  for (int i = 0; i < count; ++i) {
     trace.append(R"({"call":"open","session":"client)").append(std::to_string(i)).append(R"(","sensor":"LIFT"})");
     trace.append("\n");
   }
-  const std::string svg = plot(trace);
+  return trace;
+}
+
+TEST_F(PlotOf, ManyClientsShowsTheFirst) {
+  const std::string svg = plot(traceOfClients(30));
   EXPECT_NE(svg.find(">client23</text>"), std::string::npos);
   EXPECT_EQ(svg.find(">client24</text>"), std::string::npos);
-  EXPECT_NE(svg.find(">more clients are not shown</text>"), std::string::npos);
+  EXPECT_NE(svg.find(">6 more clients are not shown: --session chooses</text>"), std::string::npos);
+}
+
+TEST_F(PlotOf, ChosenClientsShowsThese) {
+  const std::string svg = plot(traceOfClients(30), {"--session", "client29", "--session", "client2"});
+  EXPECT_NE(svg.find(">client29</text>"), std::string::npos);
+  EXPECT_NE(svg.find(">client2</text>"), std::string::npos);
+  EXPECT_EQ(countOf(">client", svg), 2U);
+}
+
+TEST_F(PlotOf, SeveralRequestsBeforeARecordShowsThemAll) {
+  const std::string svg = plot(R"({"call":"open","session":"a","sensor":"STAP"}
+{"call":"set_option","session":"a","option":{"classMask":1}}
+{"call":"set_option","session":"a","option":{"classMask":2,"clasMask":3}}
+{"call":"set_option","session":"a","option":"["}
+{"call":"dispatch","sensor":"STAP","record":{"timestamp":1000,"classes":1}}
+{"call":"dispatch","sensor":"STAP","record":{"timestamp":3000,"classes":1}}
+)");
+  // One above the other, each with its mark: a diamond, or a cross.
+  EXPECT_NE(svg.find(R"(<text x="159" y="175" class="note small">classMask 1</text>)"), std::string::npos) << svg;
+  EXPECT_NE(svg.find(R"(<text x="159" y="157" class="note small">classMask 2, clasMask 3 (unknown key)</text>)"),
+            std::string::npos);
+  EXPECT_NE(svg.find(R"(<text x="159" y="139" class="note small">refused: [</text>)"), std::string::npos);
+  EXPECT_NE(svg.find(R"(<path class="ask" d="M150 166l5 5-5 5-5-5zM150 148l5 5-5 5-5-5z"/>)"), std::string::npos);
+  EXPECT_NE(svg.find(R"(<path class="no" d="M146 131l8 8m0-8l-8 8"/>)"), std::string::npos);
+}
+
+TEST_F(PlotOf, RecordsInTimeHasAnAxisInHoursMinutesAndSeconds) {
+  const std::string svg = plot(R"({"note":"","timeUnit":"s"}
+{"call":"open","session":"a","sensor":"LIFT"}
+{"call":"dispatch","sensor":"LIFT","record":{"timestamp":3600,"class":1}}
+{"call":"dispatch","sensor":"LIFT","record":{"timestamp":10800,"class":1}}
+)");
+  for (const char* mark : {">1:00:00</text>", ">2:00:00</text>", ">5:00:00</text>", ">time</text>"}) {
+    EXPECT_NE(svg.find(mark), std::string::npos) << mark << svg;
+  }
+}
+
+// A recording has a line for each session that a record went to.
+TEST_F(PlotOf, ARecordingCountsEachRecordOnce) {
+  const std::string svg = plot(R"({"call":"open","session":"s1","sensor":"LIFT"}
+{"call":"open","session":"s2","sensor":"LIFT"}
+{"call":"dispatch","session":"s1","record":{"timestamp":1,"class":1}}
+{"call":"dispatch","session":"s2","record":{"timestamp":1,"class":1}}
+)");
+  EXPECT_NE(svg.find(">records</text>\n<text x=\"20\" y=\"112\" class=\"quiet small\">1</text>"), std::string::npos)
+      << svg;
+}
+
+TEST_F(PlotOf, APictureNamedPngIsOneWhereItCanBeDrawn) {
+  const std::string png = file + ".png";
+  const ToolRun run = runTool({"replay", "--quiet", "--plot", png, "lift.jsonl"});
+  if (run.status == 0) {
+    EXPECT_EQ(contentOf(png).substr(0, 8), "\x89PNG\r\n\x1A\n");
+    std::remove(png.c_str());
+  } else {
+    EXPECT_EQ(run.status, 2);
+  }
+  const ToolRun without = runTool({"replay", "--plot", png, "lift.jsonl"}, "", {{"PATH", "/nowhere"}});
+  EXPECT_EQ(without.err, "senseloom: " + png +
+                             ": takes the program rsvg-convert, which is not here (Debian's package librsvg2-bin); "
+                             "write an .svg instead\n");
+  EXPECT_EQ(without.status, 2);
+  EXPECT_FALSE(std::filesystem::exists(png));
 }
 
 TEST_F(PlotOf, AnEmptyTraceIsAPictureAllTheSame) {
@@ -146,6 +221,15 @@ TEST(Plot, HasTheNamesOfClassesThatTheTraceHas) {
                 .status,
             0);
   EXPECT_NE(contentOf(picture.name).find(">raised<"), std::string::npos);
+}
+
+TEST(PlotErrors, KeepTheTrace) {
+  const ScratchFile file("trace.jsonl");
+  std::ofstream(file.name) << kTaps;
+  const ToolRun run = runTool({"replay", "--plot", file.name, file.name});
+  EXPECT_EQ(run.err, "senseloom: " + file.name + ": is the input, which would be lost\n");
+  EXPECT_EQ(run.status, 2);
+  EXPECT_EQ(contentOf(file.name), kTaps);
 }
 
 }  // namespace

@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <string>
+#include <vector>
+
 namespace senseloom::tool {
 namespace {
 
@@ -38,6 +41,15 @@ TEST(SvgText, FindsAxisSteps) {
   EXPECT_EQ(axisStep(35, 8), 5);
   EXPECT_EQ(axisStep(36000000, 8), 5000000);
   EXPECT_EQ(axisStep(70, 8), 10);
+}
+
+TEST(SvgText, LongNamesLoseTheirMiddleAndStayDifferent) {
+  EXPECT_EQ(shortenedApart({"nav", "seventeen letters", "com.example.navigation.first", "com.example.navigation.last",
+                            "com.example.something.first"}),
+            (std::vector<std::string>{"nav", "seventeen letters", "com.ex....first", "com.ex...n.last",
+                                      "com.ex....first (2)"}));
+  EXPECT_EQ(shortenedApart({"\xC3\xA4\xC3\xA4\xC3\xA4 twenty characters \xC3\xBC"}),
+            std::vector<std::string>{"\xC3\xA4\xC3\xA4\xC3\xA4 tw...ters \xC3\xBC"});
 }
 
 }  // namespace

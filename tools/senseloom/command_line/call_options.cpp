@@ -43,8 +43,10 @@ void addClassNamesOption(CLI::App& command, std::string& names) {
 }
 
 CLI::Option* addPlotOptions(CLI::App& command, PlotArguments& plot) {
-  auto* file =
-      command.add_option("--plot", plot.file, "write a picture of it to this file, as SVG")->type_name("PICTURE");
+  auto* file = command
+                   .add_option("--plot", plot.file,
+                               "write a picture of it to this file, as SVG or, if it ends with .png, as PNG")
+                   ->type_name("PICTURE");
   addClassNamesOption(command, plot.classNames);
   return file;
 }

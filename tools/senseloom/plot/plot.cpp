@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <utility>
 
+#include "kinds/option_data.h"
+#include "plot/svg_text.h"
 #include "trace/json.h"
 #include "trace/record_field.h"
 
@@ -10,10 +12,16 @@ namespace senseloom::tool {
 namespace {
 
 constexpr size_t kMostClients = 24;
-constexpr size_t kMostCharacters = 48;
+constexpr size_t kMostCharacters = 96;
+
+bool isKnown(const char* sensor, const std::string& key) {
+  const OptionDescription& kind = *findOptionDescription(sensor);
+  return std::ranges::any_of(kind.keys, [&key](const auto& known) { return key == known.name; }) ||
+         std::ranges::find(kind.stringKeys, key) != kind.stringKeys.end();
+}
 
 // An option in few words: its members, or the text as it stands.
-std::string optionText(const std::optional<std::string>& option) {
+std::string optionText(const char* sensor, const std::optional<std::string>& option) {
   if (!option) return "a null pointer";
   const Json root(json_loads(option->c_str(), 0, nullptr));
   std::string text;
@@ -21,13 +29,11 @@ std::string optionText(const std::optional<std::string>& option) {
   json_t* value;
   json_object_foreach(root.get(), key, value) {
     if (!text.empty()) text += ", ";
-    text += std::string(key) + ' ' + (json_is_integer(value) ? std::to_string(json_integer_value(value)) : "...");
+    text.append(key).append(" ").append(json_is_integer(value) ? std::to_string(json_integer_value(value)) : "...");
+    if (!isKnown(sensor, key)) text += " (unknown key)";
   }
   if (text.empty()) text = root == nullptr ? *option : "{}";
-  if (text.size() <= kMostCharacters) return text;
-  size_t end = kMostCharacters;
-  while (end > 0 && (static_cast<unsigned char>(text[end]) & 0xC0) == 0x80) --end;  // not within a character
-  return text.substr(0, end) + "...";
+  return shortened(text, kMostCharacters);
 }
 
 }  // namespace
@@ -84,7 +90,9 @@ void Plot::setOption(const CallOutcome& outcome, PlotLane& client) {
   const size_t now = timeline.nextBin();
   client.at(now).asks = true;
   client.at(now).isRefused |= outcome.failed;
-  client.addNote(now, (outcome.failed ? "refused: " : "") + optionText(outcome.call.option));
+  client.addNote(now,
+                 {.text = (outcome.failed ? "refused: " : "") + optionText(outcome.sensor->name, outcome.call.option),
+                  .isRefused = outcome.failed});
 }
 
 Plot::Group& Plot::groupOf(const Sensor& sensor) {
@@ -98,7 +106,7 @@ PlotLane* Plot::clientOf(Group& group, const std::string& session) {
                                   [&session](const PlotLane& lane) { return lane.name == session; });
   if (known != group.clients.end()) return &*known;
   if (clients == kMostClients) {
-    cut = true;
+    leftOut.emplace(group.sensor, session);
     return nullptr;
   }
   ++clients;

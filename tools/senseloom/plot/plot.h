@@ -1,7 +1,9 @@
 #pragma once
 
 #include <cstddef>
+#include <set>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "plot/plot_lane.h"
@@ -25,8 +27,8 @@ class Plot final : public ReplayObserver {
 
   const Timeline& time() const { return timeline; }
   const std::vector<Group>& sensorGroups() const { return groups; }
-  // There were too many clients for one picture, so some were left out.
-  bool isCut() const { return cut; }
+  // How many clients have no lane.
+  size_t clientsLeftOut() const { return leftOut.size(); }
 
  private:
   void dispatch(const CallOutcome& outcome, Group& group, PlotLane* client);
@@ -39,7 +41,7 @@ class Plot final : public ReplayObserver {
   size_t clients = 0;
   RecordJoiner joiner;
   uint64_t timestamp = 0;
-  bool cut = false;
+  std::set<std::pair<const Sensor*, std::string>> leftOut;
 };
 
 }  // namespace senseloom::tool

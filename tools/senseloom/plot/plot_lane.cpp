@@ -32,8 +32,9 @@ void PlotLane::fold() {
   for (Note& note : notes) note.bin /= 2;
 }
 
-void PlotLane::addNote(size_t bin, std::string text) {
-  if (notes.size() < kMostNotes) notes.push_back({bin, std::move(text)});
+void PlotLane::addNote(size_t bin, Note note) {
+  note.bin = bin;
+  if (notes.size() < kMostNotes) notes.push_back(std::move(note));
 }
 
 }  // namespace senseloom::tool

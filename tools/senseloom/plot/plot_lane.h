@@ -23,9 +23,11 @@ class PlotLane {
     bool isRefused = false;              // an option was set and refused
     bool negotiates = false;
   };
+  // What a client asked for.
   struct Note {
-    size_t bin;
     std::string text;
+    bool isRefused = false;
+    size_t bin = 0;
   };
 
   explicit PlotLane(std::string laneName) : name(std::move(laneName)) {}
@@ -33,7 +35,7 @@ class PlotLane {
   void receive(size_t bin, const RecordHues& record);
   void fold();
   // Keeps as many notes as a picture can show, and drops further ones.
-  void addNote(size_t bin, std::string text);
+  void addNote(size_t bin, Note note);
   Bin& at(size_t bin) { return bins[bin]; }
   const Bin& at(size_t bin) const { return bins[bin]; }
   const std::vector<Note>& allNotes() const { return notes; }

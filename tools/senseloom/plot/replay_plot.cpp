@@ -1,13 +1,17 @@
 #include "plot/replay_plot.h"
 
+#include <span>
+
 #include "plot/picture_file.h"
 #include "plot/svg_picture.h"
+#include "trace/time_unit.h"
 
 namespace senseloom::tool {
+
 ReplayPlot::ReplayPlot(std::unique_ptr<ReplayObserver> replayOutput, const TraceReader& reader,
                        PlotArguments plotArguments)
     : output(std::move(replayOutput)), trace(reader), arguments(std::move(plotArguments)) {
-  requireWritable(arguments.file);
+  requireWritable(arguments.file, std::span(&trace.fileName(), 1));
 }
 
 void ReplayPlot::onOutcome(const CallOutcome& outcome) {
@@ -16,7 +20,9 @@ void ReplayPlot::onOutcome(const CallOutcome& outcome) {
 }
 
 void ReplayPlot::onEnd() {
-  writePicture(arguments.file, drawSvg(plot, traceTitle(trace.fileName()), classNamesOf(arguments.classNames, trace)));
+  writePicture(arguments.file, drawSvg(plot, {.title = traceTitle(trace.fileName()),
+                                              .classNames = classNamesOf(arguments.classNames, trace),
+                                              .timeUnit = trace.timeUnit().value_or(kMillisecond)}));
   output->onEnd();
 }
 

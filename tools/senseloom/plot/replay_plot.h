@@ -18,8 +18,8 @@ struct PlotArguments {
   std::string classNames = {};  // for readClassNames(); empty: those of the trace
 };
 
-// Passes everything on to an output, and at the end writes a picture of the replay. Throws std::runtime_error if the
-// file cannot be written, and does so at once if it cannot be opened.
+// Passes everything on to an output, and at the end writes a picture of the replay. Throws as requireWritable() does,
+// at once.
 class ReplayPlot final : public ReplayObserver {
  public:
   ReplayPlot(std::unique_ptr<ReplayObserver> replayOutput, const TraceReader& reader, PlotArguments plotArguments);

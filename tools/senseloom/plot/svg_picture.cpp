@@ -11,6 +11,7 @@
 #include "plot/svg_canvas.h"
 #include "plot/svg_lane.h"
 #include "plot/svg_text.h"
+#include "trace/human_time.h"
 
 namespace senseloom::tool {
 namespace {
@@ -22,10 +23,18 @@ constexpr double kMargin = 20;
 constexpr double kRecordsHeight = 44;
 constexpr double kClientHeight = 24;
 constexpr double kNoteHeight = 18;  // above the lane of a client, for what it asks
-constexpr double kClientStride = kNoteHeight + kClientHeight + 8;
+constexpr double kClientGap = 8;
 constexpr double kCharacter = 5.9;  // about the width of one, to keep texts apart
-constexpr size_t kMostNameCharacters = 18;
+constexpr double kNoteGap = 12;     // between one text and the next
 constexpr int kMostAxisMarks = 8;
+
+// What a client asked for, in a place of its own above the lane.
+struct PlacedNote {
+  const PlotLane::Note* note;
+  double x;
+  double left;  // of its text
+  size_t row;   // from the lane upwards
+};
 
 constexpr SvgColour kColours[] = {
     {".back", "fill", "#ffffff", "#0d1117"},   {"text", "fill", "#1f2328", "#e6edf3"},
@@ -42,11 +51,11 @@ constexpr char kRules[] =
 
 class Picture {
  public:
-  Picture(const Plot& drawn, const std::vector<std::string>& names) : plot(drawn), classNames(names) {}
+  Picture(const Plot& drawn, const PictureHead& pictureHead) : plot(drawn), head(pictureHead) {}
 
-  std::string draw(const std::string& title) {
+  std::string draw() {
     y = kMargin + 12;
-    canvas.addText(kMargin, y, "head", title);
+    canvas.addText(kMargin, y, "head", head.title);
     canvas.addText(kWidth - kRight, y, "quiet", "the records of a sensor, and what each client received of them",
                    "end");
     y += 10;
@@ -54,7 +63,7 @@ class Picture {
     addAxis();
     addKey();
     y = std::ceil(y);
-    return canvas.document(title, kWidth, y, kRules, colours());
+    return canvas.document(head.title, kWidth, y, kRules, colours());
   }
 
  private:
@@ -86,10 +95,18 @@ class Picture {
     addNames("records", grouped(group.records.offered), y + kRecordsHeight / 2);
     canvas.add(SvgLane(plot.time(), sensor, {kLeft, y, laneWidth(), kRecordsHeight}).draw(group.records, most));
     y += kRecordsHeight + 4;
-    for (const PlotLane& client : group.clients) addClient(client, sensor, most);
+    std::vector<std::string> names;
+    for (const PlotLane& client : group.clients) names.push_back(client.name);
+    names = shortenedApart(names);
+    std::vector<double> laneTops;
+    for (size_t i = 0; i < names.size(); ++i) {
+      const auto notes = place(group.clients[i]);
+      y += kNoteHeight * static_cast<double>(rowsOf(notes));
+      laneTops.push_back(y);
+      addClient(group.clients[i], names[i], sensor, most);
+    }
     addNegotiations(group.records, top, y);
-    y -= kClientStride * static_cast<double>(group.clients.size());
-    for (const PlotLane& client : group.clients) addAsks(client);
+    for (size_t i = 0; i < names.size(); ++i) addRequests(group.clients[i], laneTops[i]);
   }
 
   void addLegend(const Plot::Group& group, const Sensor& sensor) {
@@ -103,7 +120,7 @@ class Picture {
     double x = left;
     for (size_t hue = 0; hue < kHues; ++hue) {
       if (all.counts[hue] == 0) continue;
-      const std::string text = hueText(sensor, hue, classNames);
+      const std::string text = hueText(sensor, hue, head.classNames);
       const double width = 16 + kCharacter * static_cast<double>(text.size()) + 16;
       if (x + width > kWidth - kRight + 16 && x > left) {
         x = left;
@@ -117,17 +134,16 @@ class Picture {
   }
 
   void addNames(const std::string& name, const std::string& detail, double middle) {
-    canvas.addText(kMargin, middle - 2, "name", shortened(name, kMostNameCharacters));
+    canvas.addText(kMargin, middle - 2, "name", name);
     canvas.addText(kMargin, middle + 12, "quiet small", detail);
   }
 
-  void addClient(const PlotLane& client, const Sensor& sensor, uint32_t most) {
-    y += kNoteHeight;
-    addNames(client.name, grouped(client.results) + " of " + grouped(client.offered), y + kClientHeight / 2);
+  void addClient(const PlotLane& client, const std::string& name, const Sensor& sensor, uint32_t most) {
+    addNames(name, grouped(client.results) + " of " + grouped(client.offered), y + kClientHeight / 2);
     addPresence(client);
     canvas.add(SvgLane(plot.time(), sensor, {kLeft, y, laneWidth(), kClientHeight}).draw(client, most));
     if (sensor.lasts) addResultTicks(client);
-    y += kClientStride - kNoteHeight;
+    y += kClientHeight + kClientGap;
   }
 
   // The times at which the client has a session.
@@ -157,33 +173,53 @@ class Picture {
     canvas.addPath("tick", ticks);
   }
 
-  // What the client asks for, at the time it does. A text that would run into the one before it is left out.
-  void addAsks(const PlotLane& client) {
-    y += kNoteHeight;
-    double end = 0;
+  // Places for what a client asks for, at the time it does. A text that would run into another one goes above it.
+  std::vector<PlacedNote> place(const PlotLane& client) const {
+    std::vector<PlacedNote> placed;
+    std::vector<double> ends;  // by row
     for (const PlotLane::Note& note : client.allNotes()) {
       const double x = xOf(note.bin);
       const double width = kCharacter * static_cast<double>(note.text.size());
       const bool fits = x + 9 + width < kWidth - 4;
-      const double left = fits ? x + 9 : x - 9 - width;
-      if (left < end || left < kLeft - 4) continue;
-      canvas.addText(fits ? x + 9 : x - 9, y - 5, "note small", note.text, fits ? "start" : "end");
-      end = left + width + 12;
+      const double left = fits ? x + 9 : std::max(x - 9 - width, 4.0);
+      size_t row = 0;
+      while (row < ends.size() && ends[row] > std::min(x - 5, left)) ++row;
+      if (row == ends.size()) ends.emplace_back();
+      ends[row] = std::max(x + 5, left + width) + kNoteGap;
+      placed.push_back({.note = &note, .x = x, .left = left, .row = row});
     }
+    return placed;
+  }
+
+  static size_t rowsOf(const std::vector<PlacedNote>& notes) {
+    size_t rows = 1;
+    for (const PlacedNote& placed : notes) rows = std::max(rows, placed.row + 1);
+    return rows;
+  }
+
+  void addRequests(const PlotLane& client, double laneTop) {
+    std::array<bool, Timeline::kPlaces> isNoted{};
     std::string taken;
     std::string refused;
-    for (size_t bin = 0; bin < Timeline::kPlaces; ++bin) {
-      if (!client.at(bin).asks) continue;
-      const std::string at = coordinate(xOf(bin)) + ' ';
-      if (client.at(bin).isRefused) {
-        refused += 'M' + coordinate(xOf(bin) - 4) + ' ' + coordinate(y - 13) + "l8 8m0-8l-8 8";
+    const auto mark = [&](double x, double baseline, bool isRefused) {
+      if (isRefused) {
+        refused += 'M' + coordinate(x - 4) + ' ' + coordinate(baseline - 8) + "l8 8m0-8l-8 8";
       } else {
-        taken += 'M' + at + coordinate(y - 14) + "l5 5-5 5-5-5z";
+        taken += 'M' + coordinate(x) + ' ' + coordinate(baseline - 9) + "l5 5-5 5-5-5z";
       }
+    };
+    for (const PlacedNote& placed : place(client)) {
+      const double baseline = laneTop - 5 - kNoteHeight * static_cast<double>(placed.row);
+      canvas.addText(placed.left, baseline, "note small", placed.note->text);
+      mark(placed.x, baseline, placed.note->isRefused);
+      isNoted[placed.note->bin] = true;
+    }
+    for (size_t bin = 0; bin < Timeline::kPlaces; ++bin) {
+      const PlotLane::Bin& here = client.at(bin);
+      if (here.asks && !isNoted[bin]) mark(xOf(bin), laneTop - 5, here.isRefused);
     }
     canvas.addPath("ask", taken);
     canvas.addPath("no", refused);
-    y += kClientStride - kNoteHeight;
   }
 
   void addNegotiations(const PlotLane& records, double top, double bottom) {
@@ -195,20 +231,46 @@ class Picture {
     canvas.addPath("cut", lines);
   }
 
+  struct AxisMark {
+    double value;
+    std::string text;
+  };
+
+  std::vector<AxisMark> axisMarks() const {
+    const Timeline& time = plot.time();
+    std::vector<AxisMark> marks;
+    if (time.isTime()) {
+      const auto first = static_cast<uint64_t>(time.first());
+      for (const uint64_t mark : timeMarks(first, static_cast<uint64_t>(time.last()), head.timeUnit, kMostAxisMarks)) {
+        marks.push_back({static_cast<double>(mark), humanTime(mark, head.timeUnit)});
+      }
+      return marks;
+    }
+    const double step = std::max(axisStep(time.last() - time.first(), kMostAxisMarks), 1.0);
+    for (double value = std::ceil(time.first() / step) * step; value <= time.last(); value += step) {
+      marks.push_back({value, grouped(static_cast<uint64_t>(value))});
+    }
+    return marks;
+  }
+
+  // A text that would run into the one before it is left out.
   void addAxis() {
     const Timeline& time = plot.time();
     if (time.records() == 0) return;
     y += 8;
-    std::string marks = 'M' + coordinate(kLeft) + ' ' + coordinate(y) + 'h' + coordinate(laneWidth());
-    const double span = time.last() - time.first();
-    const double step = std::max(axisStep(span, kMostAxisMarks), 1.0);
-    for (double value = std::ceil(time.first() / step) * step; value <= time.last(); value += step) {
-      const double x = kLeft + laneWidth() * (value - time.first()) / span;
-      marks += 'M' + coordinate(x) + ' ' + coordinate(y) + "v5";
-      canvas.addText(x, y + 18, "quiet small", grouped(static_cast<uint64_t>(value)), "middle");
+    std::string path = 'M' + coordinate(kLeft) + ' ' + coordinate(y) + 'h' + coordinate(laneWidth());
+    double end = 0;
+    for (const AxisMark& mark : axisMarks()) {
+      const double x = kLeft + laneWidth() * (mark.value - time.first()) / (time.last() - time.first());
+      path += 'M' + coordinate(x) + ' ' + coordinate(y) + "v5";
+      const double half = kCharacter * static_cast<double>(mark.text.size()) / 2;
+      const double middle = std::min(x, kWidth - 8 - half);
+      if (middle - half < end) continue;
+      canvas.addText(middle, y + 18, "quiet small", mark.text, "middle");
+      end = middle + half + kNoteGap;
     }
-    canvas.addPath("axis", marks);
-    canvas.addText(kMargin, y + 18, "quiet small", time.isTime() ? "timestamp" : "record");
+    canvas.addPath("axis", path);
+    canvas.addText(kMargin, y + 18, "quiet small", time.isTime() ? "time" : "record");
     y += 18;
   }
 
@@ -253,12 +315,15 @@ class Picture {
     canvas.add("<rect class=\"open\" x=\"" + coordinate(x - 4) + "\" y=\"" + coordinate(y - 9) +
                "\" width=\"12\" height=\"11\"/>\n");
     explain("the session is open");
-    if (plot.isCut()) canvas.addText(kWidth - kRight, y, "quiet small", "more clients are not shown", "end");
+    if (const size_t more = plot.clientsLeftOut(); more > 0) {
+      const std::string text = grouped(more) + " more " + (more == 1 ? "client is" : "clients are");
+      canvas.addText(kWidth - kRight, y, "quiet small", text + " not shown: --session chooses", "end");
+    }
     y += kMargin;
   }
 
   const Plot& plot;
-  const std::vector<std::string>& classNames;
+  const PictureHead& head;
   SvgCanvas canvas;
   RecordHues usedHues;
   double y = 0;  // down to where the picture is drawn
@@ -266,8 +331,8 @@ class Picture {
 
 }  // namespace
 
-std::string drawSvg(const Plot& plot, const std::string& title, const std::vector<std::string>& names) {
-  return Picture(plot, names).draw(title);
+std::string drawSvg(const Plot& plot, const PictureHead& head) {
+  return Picture(plot, head).draw();
 }
 
 }  // namespace senseloom::tool

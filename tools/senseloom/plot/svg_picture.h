@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstdint>
 #include <string>
 #include <vector>
 
@@ -7,8 +8,14 @@
 
 namespace senseloom::tool {
 
-// A plot as a self-contained SVG file, on a light or a dark ground as the viewer prefers. `names` are the names
-// of the classes from 0 on, as far as they have any.
-std::string drawSvg(const Plot& plot, const std::string& title, const std::vector<std::string>& names);
+// What a picture says beside its plot.
+struct PictureHead {
+  std::string title;
+  std::vector<std::string> classNames;  // from class 0 on, as far as they have any
+  int64_t timeUnit;                     // of the timestamps, in nanoseconds
+};
+
+// A plot as a self-contained SVG file, on a light or a dark ground as the viewer prefers.
+std::string drawSvg(const Plot& plot, const PictureHead& head);
 
 }  // namespace senseloom::tool

@@ -1,7 +1,9 @@
 #include "plot/svg_text.h"
 
+#include <algorithm>
 #include <array>
 #include <cmath>
+#include <cstddef>
 #include <cstdio>
 
 namespace senseloom::tool {
@@ -36,6 +38,25 @@ std::string shortened(std::string_view text, size_t most) {
     if (begins && characters++ == most) return std::string(text.substr(0, i)) + "...";
   }
   return std::string(text);
+}
+
+std::vector<std::string> shortenedApart(const std::vector<std::string>& names) {
+  constexpr std::ptrdiff_t kMost = 17;
+  constexpr size_t kKept = 6;  // at each end
+  const auto beginsCharacter = [](char c) { return (static_cast<unsigned char>(c) & 0xC0) != 0x80; };
+  std::vector<std::string> result;
+  for (const std::string& name : names) {
+    std::string text = name;
+    if (std::ranges::count_if(name, beginsCharacter) > kMost) {
+      size_t tail = name.size();
+      for (size_t kept = 0; kept < kKept; kept += beginsCharacter(name[tail]) ? 1 : 0) --tail;
+      text = shortened(name, kKept) + name.substr(tail);
+    }
+    const auto isLike = [&text](const std::string& other) { return other == text || other.starts_with(text + " ("); };
+    const auto same = std::ranges::count_if(result, isLike);
+    result.push_back(same == 0 ? text : text + " (" + std::to_string(same + 1) + ')');
+  }
+  return result;
 }
 
 std::string coordinate(double value) {

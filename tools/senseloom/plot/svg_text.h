@@ -3,6 +3,7 @@
 #include <cstdint>
 #include <string>
 #include <string_view>
+#include <vector>
 
 namespace senseloom::tool {
 
@@ -11,6 +12,9 @@ std::string xmlText(std::string_view text);
 
 // The first characters of a UTF-8 text, with dots in place of those left out.
 std::string shortened(std::string_view text, size_t most);
+
+// Names as they fit before a lane. Those that are too long lose their middle, and stay different from each other.
+std::vector<std::string> shortenedApart(const std::vector<std::string>& names);
 
 // A coordinate with one decimal at most.
 std::string coordinate(double value);

@@ -28,7 +28,7 @@ void check(const SweepArguments& arguments) {
                      " times, not " + std::to_string(arguments.truthFiles.size()));
   }
   if (!arguments.rows.sortedBy.empty()) figureNamed(arguments.rows.sortedBy);
-  if (!arguments.plot.empty()) requireWritable(arguments.plot);
+  if (!arguments.plot.empty()) requireWritable(arguments.plot, arguments.traces);
 }
 
 std::vector<SweepScript> readScripts(const SweepArguments& arguments, SweptClient& client) {

@@ -7,13 +7,17 @@
 
 namespace senseloom::tool {
 
+void requireOtherFile(const std::string& output, const std::string& input) {
+  std::error_code error;
+  if (std::filesystem::is_regular_file(output, error) && std::filesystem::equivalent(output, input, error)) {
+    throw InputError(output + ": is the input, which would be lost");
+  }
+}
+
 OutputSink::OutputSink(std::FILE* standardOutput, const std::string& file, const std::string& input)
     : out(standardOutput) {
   if (file.empty()) return;
-  std::error_code error;
-  if (std::filesystem::is_regular_file(file, error) && std::filesystem::equivalent(file, input, error)) {
-    throw InputError(file + ": is the input, which would be lost");
-  }
+  requireOtherFile(file, input);
   newFile.emplace(file, 0666, NewFile::Rest::removed);
 }
 

@@ -9,6 +9,9 @@
 
 namespace senseloom::tool {
 
+// Throws InputError if a file that is to be written is the one that is read.
+void requireOtherFile(const std::string& output, const std::string& input);
+
 // Where a command writes: a file that gets its name when it is complete, or standard output.
 class OutputSink {
  public:
