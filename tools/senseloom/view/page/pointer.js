@@ -19,7 +19,7 @@ export class Pointer {
   }
 
   // The position below a pointer.
-  positionOf(event) {
+  placeOf(event) {
     const box = byId("ruler").getBoundingClientRect();
     const { from, to } = this.page.state.values;
     this.x = event.clientX - box.left;
@@ -29,7 +29,7 @@ export class Pointer {
 
   indexOf(event) {
     const { records } = this.page;
-    const at = this.positionOf(event);
+    const at = this.placeOf(event);
     const index = records.indexAt(at);
     if (index + 1 >= records.count) return index;
     return records.timeOf(index + 1) - at < at - records.timeOf(index) ? index + 1 : index;
@@ -61,14 +61,14 @@ export class Pointer {
       event.currentTarget.setPointerCapture(event.pointerId);
     }
     if (!this.isDragged) return;
-    this.positionOf(event);
+    this.placeOf(event);
     const others = [...this.down.entries()].filter(([id]) => id !== event.pointerId);
     if (others.length === 0) {
       this.page.state.pan((before.x - event.clientX) * this.perPixel);
     } else {
       const [[, other]] = others;
       const factor = Math.abs(before.x - other.x) / Math.max(Math.abs(event.clientX - other.x), 1);
-      this.page.state.zoom(factor, this.positionOf({ clientX: other.x }));
+      this.page.state.zoom(factor, this.placeOf({ clientX: other.x }));
     }
     before.x = event.clientX;
   }
@@ -89,7 +89,7 @@ export class Pointer {
   }
 
   onWheel(event) {
-    const at = this.positionOf(event);
+    const at = this.placeOf(event);
     if (event.ctrlKey || event.metaKey) {
       event.preventDefault();
       this.page.state.zoom(Math.exp(event.deltaY / 300), at);

@@ -33,8 +33,9 @@ export class State {
     for (const [name, value] of Object.entries(this.values)) {
       if (value !== undefined && value !== "" && value !== this.whole[name]) address.set(name, String(value));
     }
+    const { pathname, search } = window.location;
     const hash = address.toString();
-    window.history.replaceState(null, "", hash === "" ? window.location.pathname : `#${hash}`);
+    window.history.replaceState(null, "", hash === "" ? pathname + search : `#${hash}`);
     this.onChange();
   }
 
