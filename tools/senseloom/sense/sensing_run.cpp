@@ -9,6 +9,7 @@
 #include "trace/class_names.h"
 #include "trace/hex.h"
 #include "trace/record_codec.h"
+#include "trace/time_unit.h"
 #include "trace/trace_form.h"
 
 namespace senseloom::tool {
@@ -45,7 +46,7 @@ Json callLine(CallKind kind) {
 SensingRun::SensingRun(Write toTrace, const SensingArguments& given)
     : writeLine(std::move(toTrace)), arguments(given), replayer(*this) {
   if (arguments.plot.file.empty()) return;
-  requireWritable(arguments.plot.file);
+  requireWritable(arguments.plot.file, arguments.recordings);
   plot.emplace();
 }
 
@@ -65,7 +66,9 @@ void SensingRun::run(const std::vector<Recording::Row>& rows) {
   if (!plot) return;
   const ClassNames names =
       arguments.plot.classNames.empty() ? namesOfClasses() : readClassNames(arguments.plot.classNames);
-  writePicture(arguments.plot.file, drawSvg(*plot, traceTitle(arguments.recordings.front()), names));
+  writePicture(arguments.plot.file, drawSvg(*plot, {.title = traceTitle(arguments.recordings.front()),
+                                                    .classNames = names,
+                                                    .timeUnit = kMillisecond}));
 }
 
 void SensingRun::start() {
