@@ -53,6 +53,8 @@ void declareExplain(CLI::App& app, Action& action) {
   command->add_flag("--json", arguments->form.json, "print one JSON object per call");
   addTimeUnitOption(*command, arguments->form.filter.timeUnit);
   addFilterOptions(*command, arguments->form.filter);
+  command->add_flag("--follow", arguments->form.follows, "wait for more until the recording has its end")
+      ->excludes(options);
   addPlotOptions(*command, arguments->plot)->excludes(options);
   command->callback([arguments, options, &action] {
     arguments->options = options->reduced_results();

@@ -29,7 +29,9 @@ void requireObject(const std::string& session, const std::string& option) {
 }
 
 // A mistyped sensor looks like the name of a file.
-TraceReader openTrace(const std::string& file) try { return TraceReader(file); } catch (const InputError& error) {
+TraceReader openTrace(const std::string& file, const Waiting& waiting) try {
+  return TraceReader(file, TraceReader::printOnStandardError, waiting);
+} catch (const InputError& error) {
   const std::string nearest = nearestSensor(file);
   const bool isMistyped = model::editDistance(file, nearest) <= 2;
   throw InputError(std::string(error.what()) + ", and no sensor has that name" +
@@ -70,7 +72,7 @@ void explainOptions(std::FILE* out, const std::string& sensor, const std::vector
 
 void explainTrace(std::FILE* out, const std::string& file, const ExplanationForm& form, const PlotArguments& plot) {
   const InterruptMark mark;
-  TraceReader trace = openTrace(file);
+  TraceReader trace = openTrace(file, {.follows = form.follows, .meanwhile = [out] { std::fflush(out); }});
   LogCapture log;
   const auto output = withFilter(makeOutput(out, form), form.filter, trace);
   auto explainer = std::make_unique<Explainer>(*output, log);

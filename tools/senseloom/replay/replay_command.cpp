@@ -60,6 +60,7 @@ struct ReplayArguments {
   TableForm table;
   std::string times;
   FilterArguments filter;
+  bool follows = false;
   std::string log = defaultLogLevel();
   PlotArguments plot;
 };
@@ -79,7 +80,8 @@ std::unique_ptr<ReplayObserver> makeOutput(std::FILE* out, const ReplayArguments
 
 void replay(std::FILE* out, const ReplayArguments& arguments) {
   const InterruptMark mark;
-  TraceReader trace(arguments.file);
+  TraceReader trace(arguments.file, TraceReader::printOnStandardError,
+                    {.follows = arguments.follows, .meanwhile = [out] { std::fflush(out); }});
   __android_log_set_minimum_priority(kLogLevels.at(arguments.log));
   const bool isFilling = !arguments.quiet && !arguments.check;
   auto shown = withFilter(withPlot(makeOutput(out, arguments, trace), trace, arguments.plot), arguments.filter, trace);
@@ -115,6 +117,7 @@ void declareReplay(CLI::App& app, Action& action) {
   addLimitOption(*command, arguments->most);
   addTimeUnitOption(*command, arguments->filter.timeUnit);
   addFilterOptions(*command, arguments->filter);
+  command->add_flag("--follow", arguments->follows, "wait for more until the recording has its end");
   addPlotOptions(*command, arguments->plot);
   command->callback([arguments, &action] { action = [arguments](std::FILE* out) { replay(out, *arguments); }; });
 }

@@ -1,6 +1,7 @@
 #include "trace/byte_stream.h"
 
 #include <fcntl.h>
+#include <poll.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -17,16 +18,13 @@
 namespace senseloom::tool {
 namespace {
 
-constexpr std::string_view kGzip = "\x1f\x8b";
-constexpr std::string_view kZstd = "\x28\xb5\x2f\xfd";
-
 // A file as it is, with a look ahead at its first bytes.
 class PlainBytes final : public ByteStream {
  public:
-  explicit PlainBytes(int file) : descriptor(file) {
-    while (start.size() < kZstd.size()) {
+  PlainBytes(int file, BeforeWait toCall) : descriptor(file), beforeWait(std::move(toCall)) {
+    while (start.size() < kZstdMark.size()) {
       char bytes[4];
-      const size_t count = readFile(bytes, kZstd.size() - start.size());
+      const size_t count = readFile(bytes, kZstdMark.size() - start.size());
       if (count == 0) break;
       start.append(bytes, count);
     }
@@ -52,6 +50,8 @@ class PlainBytes final : public ByteStream {
 
  private:
   size_t readFile(char* bytes, size_t room) const {
+    pollfd input{.fd = descriptor, .events = POLLIN, .revents = 0};
+    if (poll(&input, 1, 0) == 0) beforeWait();
     ssize_t count;
     do {
       if (isInterrupted()) return 0;
@@ -62,17 +62,18 @@ class PlainBytes final : public ByteStream {
   }
 
   const int descriptor;
+  const BeforeWait beforeWait;
   std::string start;
 };
 
 }  // namespace
 
-std::unique_ptr<ByteStream> openBytes(const std::string& file) {
+std::unique_ptr<ByteStream> openBytes(const std::string& file, BeforeWait beforeWait) {
   const int descriptor = file == "-" ? dup(STDIN_FILENO) : open(file.c_str(), O_RDONLY | O_CLOEXEC);
   if (descriptor < 0) throw InputError(std::strerror(errno));
-  auto plain = std::make_unique<PlainBytes>(descriptor);
-  if (plain->beginsWith(kGzip)) return gunzipped(std::move(plain));
-  if (plain->beginsWith(kZstd)) return unzstded(std::move(plain));
+  auto plain = std::make_unique<PlainBytes>(descriptor, std::move(beforeWait));
+  if (plain->beginsWith(kGzipMark)) return gunzipped(std::move(plain));
+  if (plain->beginsWith(kZstdMark)) return unzstded(std::move(plain));
   return plain;
 }
 

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <functional>
 #include <memory>
 #include <string>
 
@@ -19,8 +20,12 @@ class ByteStream {
   virtual size_t size() const { return 0; }
 };
 
+// Called when all that is there so far was read, before a wait for more. Returns whether to wait.
+using BeforeWait = std::function<bool()>;
+
 // Opens a file; "-" is standard input. What is compressed by gzip or zstd, as its first bytes tell, is given as it was
-// before. Throws InputError.
-std::unique_ptr<ByteStream> openBytes(const std::string& file);
+// before. Nothing but pipes and devices is waited for, and those until their end, whatever `beforeWait` returns. Throws
+// InputError.
+std::unique_ptr<ByteStream> openBytes(const std::string& file, BeforeWait beforeWait);
 
 }  // namespace senseloom::tool

@@ -7,6 +7,7 @@
 #include "input_error.h"
 #include "terminal/interrupt.h"
 #include "trace/byte_order_mark.h"
+#include "trace/followed_bytes.h"
 #include "trace/time_unit.h"
 #include "trace/trace_time.h"
 
@@ -15,8 +16,9 @@ namespace {
 
 constexpr size_t kChunk = 1 << 16;
 
-std::unique_ptr<ByteStream> open(const std::string& file, const std::string& name) try {
-  return openBytes(file);
+std::unique_ptr<ByteStream> open(const std::string& file, const std::string& name, bool follows,
+                                 const BeforeWait& beforeWait) try {
+  return follows ? followBytes(file, beforeWait) : openBytes(file, beforeWait);
 } catch (const InputError& error) {
   throw InputError(name + ": " + error.what());
 }
@@ -36,8 +38,13 @@ std::string textMember(const Json& object, const char* key) {
 
 }  // namespace
 
-TraceReader::TraceReader(const std::string& file, Remark toRemark)
-    : name(file == "-" ? "standard input" : file), remark(std::move(toRemark)), stream(open(file, name)) {}
+TraceReader::TraceReader(const std::string& file, Remark toRemark, Waiting whileWaiting)
+    : name(file == "-" ? "standard input" : file), remark(std::move(toRemark)) {
+  stream = open(file, name, whileWaiting.follows, [this, meanwhile = std::move(whileWaiting.meanwhile)] {
+    if (meanwhile) meanwhile();
+    return !hasEnd;
+  });
+}
 
 std::optional<TraceCall> TraceReader::next() {
   Json object;
@@ -79,7 +86,7 @@ Json TraceReader::nextObject() {
   json_error_t error;
   Json object(json_loadb(line.data(), line.size(), JSON_REJECT_DUPLICATES, &error));
   if (object == nullptr) {
-    if (isRecording && !isLineWhole) return nullptr;
+    if (!isLineWhole && (isRecording || isInterrupted())) return nullptr;
     throw InputError(std::string("not JSON: ") + error.text);
   }
   if (!json_is_object(object.get())) throw InputError("not a JSON object");

@@ -16,6 +16,15 @@
 
 namespace senseloom::tool {
 
+// How a trace is read that is not there as a whole yet.
+struct Waiting {
+  // Of a file the end is waited for, too: until the recording has its end, or the user interrupts it.
+  bool follows = false;
+  // Called when all that is there so far was read, while more is waited for: at least ten times a second if it follows,
+  // otherwise once a wait. May be null.
+  std::function<void()> meanwhile = nullptr;
+};
+
 // Reads a trace, JSON Lines with one call a line, a line at a time. Blank lines are skipped, and so are lines with a
 // "note" in place of a call. What a recording says of itself is not a call either: what a reader of it should know, as
 // that something is missing or that the program broke the library's contract, is passed on as remarks. A trace without
@@ -24,8 +33,12 @@ class TraceReader {
  public:
   using Remark = std::function<void(const std::string& text)>;
 
+  static void printOnStandardError(const std::string& text);
+
   // "-" is standard input. Throws InputError when the file cannot be opened.
-  explicit TraceReader(const std::string& file, Remark remark = printOnStandardError);
+  explicit TraceReader(const std::string& file, Remark remark = printOnStandardError, Waiting whileWaiting = {});
+  TraceReader(const TraceReader&) = delete;
+  TraceReader& operator=(const TraceReader&) = delete;
 
   // The next call, or nothing at the end. Throws InputError when there is none on a line that is not blank.
   std::optional<TraceCall> next();
@@ -56,8 +69,6 @@ class TraceReader {
   uint64_t size() const { return stream->size(); }
 
  private:
-  static void printOnStandardError(const std::string& text);
-
   Json nextObject();
   bool readLine();
   bool readAboutRecording(const Json& object);
@@ -70,7 +81,6 @@ class TraceReader {
 
   std::string name;
   Remark remark;
-  std::unique_ptr<ByteStream> stream;
   std::string buffer;     // what was read
   size_t lineStart = 0;   // in it
   size_t lineLength = 0;  // bytes, with the line feed
@@ -85,6 +95,7 @@ class TraceReader {
   bool isRecording = false;  // it has a head
   bool hasEnd = false;
   bool wasEndReached = false;
+  std::unique_ptr<ByteStream> stream;
 };
 
 }  // namespace senseloom::tool
