@@ -4,6 +4,7 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <csignal>
 #include <cstdlib>
@@ -62,17 +63,17 @@ class HeldSignals {
   sigset_t mask;
 };
 
-// What is loaded by the environment already stays, in front.
-std::string addTo(const char* variable, const std::string& library) {
-  const char* others = std::getenv(variable);
-  return others == nullptr || *others == '\0' ? library : std::string(others) + ':' + library;
+bool setAll(const ChildProgram::Environment& environment) {
+  return std::all_of(environment.begin(), environment.end(), [](const auto& variable) {
+    return setenv(variable.first.c_str(), variable.second.c_str(), 1) == 0;
+  });
 }
 
 // In the child. What goes wrong is told through the pipe, which closes when the program has started.
-[[noreturn]] void start(std::vector<char*> arguments, const std::string& order, const std::string& audit, int out,
+[[noreturn]] void start(std::vector<char*> arguments, const ChildProgram::Environment& environment, int in, int out,
                         int trouble) {
-  if (setenv("SENSELOOM_TRACE", order.c_str(), 1) == 0 &&
-      setenv("LD_AUDIT", addTo("LD_AUDIT", audit).c_str(), 1) == 0 && dup2(out, STDOUT_FILENO) >= 0) {
+  const bool hasInput = in == STDIN_FILENO || dup2(in, STDIN_FILENO) >= 0;  // its own may be closed
+  if (setAll(environment) && hasInput && dup2(out, STDOUT_FILENO) >= 0) {
     execvp(arguments.front(), arguments.data());
   }
   const int error = errno;
@@ -82,8 +83,7 @@ std::string addTo(const char* variable, const std::string& library) {
 
 }  // namespace
 
-ChildProgram::ChildProgram(std::vector<std::string> command, const std::string& order, const std::string& audit,
-                           int out) {
+ChildProgram::ChildProgram(std::vector<std::string> command, const Environment& environment, int in, int out) {
   std::vector<char*> arguments;
   for (std::string& argument : command) arguments.push_back(argument.data());
   arguments.push_back(nullptr);
@@ -95,7 +95,7 @@ ChildProgram::ChildProgram(std::vector<std::string> command, const std::string& 
   if (process == 0) {
     restoreSignals();
     held.release();
-    start(std::move(arguments), order, audit, out, trouble[1]);
+    start(std::move(arguments), environment, in, out, trouble[1]);
   }
   int error = process < 0 ? errno : 0;
   receiver = process;

@@ -3,6 +3,7 @@
 #include <sys/types.h>
 
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "exit_status.h"
@@ -13,9 +14,11 @@ namespace senseloom::tool {
 // process sends are passed on, those from the keyboard the program gets by itself.
 class ChildProgram {
  public:
-  // `order` becomes the program's SENSELOOM_TRACE, `audit` is loaded by its LD_AUDIT, and `out` becomes its standard
-  // output. Throws InputError when it cannot be started.
-  ChildProgram(std::vector<std::string> command, const std::string& order, const std::string& audit, int out);
+  // Variables that it gets beside those of the tool, with their values.
+  using Environment = std::vector<std::pair<std::string, std::string>>;
+
+  // `in` and `out` become its standard input and output. Throws InputError when it cannot be started.
+  ChildProgram(std::vector<std::string> command, const Environment& environment, int in, int out);
   ChildProgram(const ChildProgram&) = delete;
   ChildProgram& operator=(const ChildProgram&) = delete;
 

@@ -3,6 +3,7 @@
 #include <unistd.h>
 
 #include <csignal>
+#include <cstdlib>
 
 #include "record/child_program.h"
 #include "record/program_file.h"
@@ -10,12 +11,24 @@
 #include "terminal/interrupt.h"
 
 namespace senseloom::tool {
+namespace {
+
+constexpr char kAudit[] = "LD_AUDIT";
+
+// What is loaded by the environment already stays, in front.
+std::string withOthers(const std::string& audit) {
+  const char* others = std::getenv(kAudit);
+  return others == nullptr || *others == '\0' ? audit : std::string(others) + ':' + audit;
+}
+
+}  // namespace
 
 void runRecorded(std::FILE* out, const RecordingArguments& arguments, const std::vector<std::string>& command) {
   const std::string audit = auditLibrary(wordSizeOf(command.front()));
   const bool isOnOutput = arguments.file == "-";
   Recording recording(arguments, fileno(out));
-  ChildProgram program(command, recording.order().text(), audit, isOnOutput ? STDERR_FILENO : fileno(out));
+  ChildProgram program(command, {{"SENSELOOM_TRACE", recording.order().text()}, {kAudit, withOthers(audit)}},
+                       STDIN_FILENO, isOnOutput ? STDERR_FILENO : fileno(out));
   std::signal(SIGPIPE, SIG_IGN);  // the program goes on when nobody reads the recording
   while (!program.hasEnded()) recording.passOn();
   // Processes that it left behind may still write.
