@@ -33,14 +33,15 @@
 #include "terminal/interrupt.h"
 #include "trim/trim_command.h"
 #include "view/view_command.h"
+#include "watch/watch_command.h"
 
 namespace senseloom::tool {
 namespace {
 
 // In the order of the help.
-constexpr Declare* kCommands[] = {declareReplay,   declareExplain, declareView,   declareRecord, declareStatus,
-                                  declareInfo,     declareDiff,    declareTrim,   declareSense,  declareSweep,
-                                  declareGenerate, declareConvert, declareSensors};
+constexpr Declare* kCommands[] = {declareReplay, declareExplain,  declareView,    declareWatch,  declareRecord,
+                                  declareStatus, declareInfo,     declareDiff,    declareTrim,   declareSense,
+                                  declareSweep,  declareGenerate, declareConvert, declareSensors};
 
 constexpr int kFailure = 1;
 constexpr int kBadInput = 2;

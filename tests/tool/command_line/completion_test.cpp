@@ -51,7 +51,9 @@ TEST(Completion, OffersCommandsOptionsAndTheirValues) {
   EXPECT_EQ(offeredByBash("replay --plot \"\""), "\n") << "a file, which the shell itself completes";
 }
 
-TEST(Completion, OffersProgramsToRecord) {
+TEST(Completion, OffersProgramsToRecordAndToWatch) {
+  EXPECT_NE(("\n" + offeredByBash("watch -- bas")).find("\nbash\n"), std::string::npos);
+  EXPECT_EQ(offeredByBash("watch \"\""), "\n") << "a file, which the shell itself completes";
   EXPECT_NE(("\n" + offeredByBash("record -o x.jsonl -- bas")).find("\nbash\n"), std::string::npos);
 }
 

@@ -67,7 +67,11 @@ class Place {
     if (!areOptionsOver && !word.empty() && word.front() == '-') return options();
     Candidates found;
     const auto positionals = command->get_options([](const CLI::Option* one) { return one->get_positional(); });
-    if (!positionals.empty()) found = valuesOf(*positionals[std::min(arguments, positionals.size() - 1)]);
+    if (!positionals.empty()) {
+      const size_t last = positionals.size() - 1;
+      const bool isProgram = areOptionsOver && valueName(*positionals[last]) == "PROGRAM";
+      found = valuesOf(*positionals[isProgram ? last : std::min(arguments, last)]);
+    }
     for (const CLI::App* below : command->get_subcommands({})) {
       found.words.push_back({below->get_name(), below->get_description()});
     }

@@ -1,0 +1,32 @@
+#include "watch/screen_text.h"
+
+#include <gtest/gtest.h>
+
+namespace senseloom::tool {
+namespace {
+
+TEST(ScreenText, CountsCharactersAndNotBytes) {
+  EXPECT_EQ(widthOf("abc"), 3U);
+  EXPECT_EQ(widthOf("Größe €"), 7U);
+  EXPECT_EQ(paddedBehind(5, "é€"), "é€   ");
+  EXPECT_EQ(paddedInFront(5, "é€"), "   é€");
+  EXPECT_EQ(paddedInFront(1, "é€"), "é€");
+}
+
+TEST(ScreenText, IsShortenedWithAnEllipsis) {
+  EXPECT_EQ(shortenedTo(4, "four"), "four");
+  EXPECT_EQ(shortenedTo(3, "four"), "fo…");
+  EXPECT_EQ(shortenedTo(3, "éé€é"), "éé…");
+  EXPECT_EQ(shortenedTo(1, "four"), "…");
+  EXPECT_EQ(shortenedTo(0, "four"), "");
+}
+
+TEST(ScreenText, CannotControlTheTerminal) {
+  EXPECT_EQ(harmless("a\x1b[2Jb\r\n\x7f"), "a [2Jb   ");
+  EXPECT_EQ(harmless("a\xC2\x9B"
+                     "2Jb \xC2\xA9"),
+            "a 2Jb ©");
+}
+
+}  // namespace
+}  // namespace senseloom::tool
