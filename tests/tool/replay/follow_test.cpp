@@ -10,7 +10,7 @@
 namespace senseloom::tool {
 namespace {
 
-constexpr char kOpen[] = R"({"call":"open","session":"a","sensor":"LIFT"})";
+constexpr char kOpenLine[] = R"({"call":"open","session":"a","sensor":"LIFT"})";
 constexpr char kDispatch[] = R"({"call":"dispatch","session":"a","record":{"timestamp":1,"class":1}})";
 
 // Whether a line of a table has these cells, whatever the blanks between them.
@@ -44,7 +44,7 @@ TEST(FollowingCommand, IsNotNeededForAPipe) {
     std::vector<std::string> command{TOOL_FILE, "explain", "--records", "-"};
     command.insert(command.end(), options.begin(), options.end());
     BackgroundProgram explain(command);
-    explain.tell(kOpen);
+    explain.tell(kOpenLine);
     EXPECT_NE(explain.ask(kDispatch).find("a on LIFT"), std::string::npos);
     EXPECT_NE(explain.ask(kDispatch).find("a on LIFT"), std::string::npos);
     EXPECT_EQ(explain.finish().status, 0);

@@ -89,30 +89,33 @@ TEST_F(TraceReading, FindsNothingInAnEmptyFileAndSaysSo) {
   EXPECT_EQ(remarksOn(""), ": the trace is empty: there is no call in it\n");
 }
 
-const std::string kHead = R"({"format":1,"tool":"1.0.0"})"
-                          "\n";
-const std::string kCall = R"({"call":"uninit","atUs":3})"
-                          "\n";
+const std::string kRecordingHead = R"({"format":1,"tool":"1.0.0"})"
+                                   "\n";
+const std::string kRecordedCall = R"({"call":"uninit","atUs":3})"
+                                  "\n";
 
 TEST_F(TraceReading, PassesARecordingThatIsWhole) {
-  EXPECT_EQ(remarksOn(kHead + kCall + kCall + R"({"end":2,"lost":0})" + "\n"), "");
-  EXPECT_EQ(remarksOn(kHead + kCall + R"({"end":1,"lost":0})" + "\n" + kCall + R"({"end":2,"lost":0})"), "");
+  EXPECT_EQ(remarksOn(kRecordingHead + kRecordedCall + kRecordedCall + R"({"end":2,"lost":0})" + "\n"), "");
+  EXPECT_EQ(remarksOn(kRecordingHead + kRecordedCall + R"({"end":1,"lost":0})" + "\n" + kRecordedCall +
+                      R"({"end":2,"lost":0})"),
+            "");
 }
 
 TEST_F(TraceReading, RemarksOnARecordingWithoutItsEnd) {
   const std::string cut = ": the recording was cut short after 1 calls: its end is missing\n";
-  EXPECT_EQ(remarksOn(kHead + kCall), cut);
+  EXPECT_EQ(remarksOn(kRecordingHead + kRecordedCall), cut);
   remarks.clear();
-  EXPECT_EQ(remarksOn(kHead + kCall + kCall.substr(0, 20)), cut) << "in the middle of a line";
+  EXPECT_EQ(remarksOn(kRecordingHead + kRecordedCall + kRecordedCall.substr(0, 20)), cut) << "in the middle of a line";
   remarks.clear();
-  EXPECT_EQ(remarksOn(kHead + kCall + std::string(9000, '\0')), cut) << "before room that was not used";
+  EXPECT_EQ(remarksOn(kRecordingHead + kRecordedCall + std::string(9000, '\0')), cut)
+      << "before room that was not used";
   remarks.clear();
-  EXPECT_EQ(remarksOn(kHead + kCall + R"({"end":1,"lost":0})" + "\n" + kCall),
+  EXPECT_EQ(remarksOn(kRecordingHead + kRecordedCall + R"({"end":1,"lost":0})" + "\n" + kRecordedCall),
             ": the recording was cut short after 2 calls: its end is missing\n");
 }
 
 TEST_F(TraceReading, RemarksOnWhatIsMissing) {
-  EXPECT_EQ(remarksOn(kHead + kCall + R"({"end":2,"lost":3,"why":"no room","cause":"a signal"})"),
+  EXPECT_EQ(remarksOn(kRecordingHead + kRecordedCall + R"({"end":2,"lost":3,"why":"no room","cause":"a signal"})"),
             ":3: the recording ended with 2 calls, but 1 are there\n" + file +
                 ":3: 3 lines could not be recorded: no room\n" + file + ":3: a signal\n");
 }
@@ -126,9 +129,9 @@ TEST_F(TraceReading, RemarksOnBreachesOfTheContract) {
 
 TEST_F(TraceReading, RefusesAnotherFormatAnotherHeadAndNoHead) {
   EXPECT_EQ(errorOf(R"({"format":2})"), "a trace of format 2, where this program reads format 1");
-  EXPECT_EQ(errorOf(kHead + kHead),
+  EXPECT_EQ(errorOf(kRecordingHead + kRecordingHead),
             "another recording, or another part of it, begins here: each is a trace of its own");
-  EXPECT_EQ(errorOf(kCall), "this is in the middle of a recording, whose head is missing");
+  EXPECT_EQ(errorOf(kRecordedCall), "this is in the middle of a recording, whose head is missing");
 }
 
 TEST_F(TraceReading, SkipsNotesOnLinesOfTheirOwn) {
