@@ -304,7 +304,7 @@ TEST(Sense, WritesOverNoRecording) {
   const std::string table = kHeading + rows(0, 3'000, 20);
   std::ofstream(recording.name) << table;
   const std::pair<std::string, std::string> refusals[] = {{"-o", "holds something already"},
-                                                          {"--plot", "is one of the recordings"}};
+                                                          {"--plot", "is the input, which would be lost"}};
   for (const auto& [option, refusal] : refusals) {
     const ToolRun run = sense("", {"--session", "a=PHYAC", option, recording.name}, recording.name);
     EXPECT_EQ(run.err, "senseloom: " + recording.name + ": " + refusal + '\n');

@@ -5,34 +5,17 @@
 
 #include <algorithm>
 #include <charconv>
-#include <filesystem>
 #include <string_view>
 
 #include "input_error.h"
 #include "sense/recording.h"
 #include "sense/sensing_run.h"
 #include "terminal/new_file.h"
+#include "terminal/output_sink.h"
 #include "trace/time_unit.h"
 
 namespace senseloom::tool {
 namespace {
-
-// Nothing of a user's is written over.
-void requireNew(const std::string& output) {
-  std::error_code error;
-  if (std::filesystem::is_regular_file(output, error) && std::filesystem::file_size(output, error) > 0) {
-    throw InputError(output + ": holds something already");
-  }
-}
-
-void requireNoRecording(const std::string& picture, const std::vector<std::string>& recordings) {
-  std::error_code error;
-  for (const std::string& recording : recordings) {
-    if (!picture.empty() && std::filesystem::equivalent(picture, recording, error)) {
-      throw InputError(picture + ": is one of the recordings");
-    }
-  }
-}
 
 bool needsRate(const std::vector<SensingClient>& clients) {
   try {
@@ -111,8 +94,7 @@ std::map<int32_t, int32_t> labelClasses(const std::string& text) {
 
 void sense(std::FILE* out, const SensingArguments& arguments) {
   __android_log_set_minimum_priority(ANDROID_LOG_WARN);  // not each negotiation
-  requireNew(arguments.output);
-  requireNoRecording(arguments.plot.file, arguments.recordings);
+  requireEmpty(arguments.output);
   checkSessions(arguments);
   const auto rows = readAll(arguments);
   if (arguments.output.empty()) {

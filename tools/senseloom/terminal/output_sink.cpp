@@ -14,6 +14,13 @@ void requireOtherFile(const std::string& output, const std::string& input) {
   }
 }
 
+void requireEmpty(const std::string& output) {
+  std::error_code error;
+  if (std::filesystem::is_regular_file(output, error) && std::filesystem::file_size(output, error) > 0) {
+    throw InputError(output + ": holds something already");
+  }
+}
+
 OutputSink::OutputSink(std::FILE* standardOutput, const std::string& file, const std::string& input)
     : out(standardOutput) {
   if (file.empty()) return;

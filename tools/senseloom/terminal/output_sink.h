@@ -12,6 +12,9 @@ namespace senseloom::tool {
 // Throws InputError if a file that is to be written is the one that is read.
 void requireOtherFile(const std::string& output, const std::string& input);
 
+// Throws InputError if a file that is to be written holds something already.
+void requireEmpty(const std::string& output);
+
 // Where a command writes: a file that gets its name when it is complete, or standard output.
 class OutputSink {
  public:

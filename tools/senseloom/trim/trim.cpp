@@ -1,7 +1,6 @@
 #include "trim/trim.h"
 
 #include <algorithm>
-#include <filesystem>
 #include <functional>
 #include <map>
 #include <memory>
@@ -13,6 +12,7 @@
 #include "input_error.h"
 #include "model/kinds.h"
 #include "terminal/new_file.h"
+#include "terminal/output_sink.h"
 #include "trace/record_codec.h"
 #include "trace/trace_reader.h"
 
@@ -24,13 +24,6 @@ constexpr size_t kMostCarried = 10'000;
 constexpr mode_t kOwnerAlone = 0600;  // a trace holds what the sensors saw
 
 void discard(const std::string& /*remark*/) {}
-
-void requireNew(const std::string& file) {
-  std::error_code error;
-  if (std::filesystem::is_regular_file(file, error) && std::filesystem::file_size(file, error) > 0) {
-    throw InputError(file + ": holds something already");
-  }
-}
 
 // The sensors of the sessions of these names.
 std::vector<std::string> sensorsOf(const std::string& trace, const std::vector<std::string>& sessions) {
@@ -61,7 +54,7 @@ class Trimmer {
   Trimmer(std::FILE* stream, const std::string& trace, const std::string& file, const FilterArguments& arguments)
       : out(stream), reader(trace), filter(arguments, reader), sensors(arguments.sensors) {
     if (!arguments.sessions.empty()) sensors = sensorsOf(trace, arguments.sessions);
-    if (!file.empty()) requireNew(file);
+    requireEmpty(file);
     if (!file.empty()) target.emplace(file, kOwnerAlone, NewFile::Rest::removed);
     reader.listen([this](size_t, const Json& aside) { takeAside(aside); });
   }
