@@ -51,7 +51,7 @@ class PlainBytes final : public ByteStream {
  private:
   size_t readFile(char* bytes, size_t room) const {
     pollfd input{.fd = descriptor, .events = POLLIN, .revents = 0};
-    if (poll(&input, 1, 0) == 0) beforeWait();
+    if (beforeWait && poll(&input, 1, 0) == 0) beforeWait();
     ssize_t count;
     do {
       if (isInterrupted()) return 0;

@@ -24,8 +24,8 @@ class ByteStream {
 using BeforeWait = std::function<bool()>;
 
 // Opens a file; "-" is standard input. What is compressed by gzip or zstd, as its first bytes tell, is given as it was
-// before. Nothing but pipes and devices is waited for, and those until their end, whatever `beforeWait` returns. Throws
-// InputError.
-std::unique_ptr<ByteStream> openBytes(const std::string& file, BeforeWait beforeWait);
+// before. Nothing but pipes and devices is waited for, and those until their end, whatever `beforeWait` returns, which
+// may be null. Throws InputError.
+std::unique_ptr<ByteStream> openBytes(const std::string& file, BeforeWait beforeWait = nullptr);
 
 }  // namespace senseloom::tool
