@@ -8,7 +8,7 @@ namespace senseloom::tool {
 
 TextLines::TextLines(const std::string& file) : name(file == "-" ? "standard input" : file), buffer() {
   try {
-    stream = openBytes(file, [] { return true; });
+    stream = openBytes(file);
   } catch (const InputError& error) {
     throw InputError(name + ": " + error.what());
   }
