@@ -14,7 +14,7 @@ printf '%s\0' "${library[@]}" | xargs -0 -n 1 -P "$(nproc)" clang-tidy -p "$buil
 cppcheck --quiet --error-exitcode=1 --std=c++20 --language=c++ --enable=warning,performance,portability \
   --suppress=CastIntegerToAddressAtReturn:src/registry/registry.cpp -I include -I src "${library[@]}"
 # "opton" is a text of the library, letter for letter; some tests mistype on purpose.
-codespell --ignore-words-list=opton,inout,stap,allone,opne,levle --skip='./build,./.git,./fuzz/corpus,*.svg,./docs/commute.html,package-lock.json,*.jsonl,LICENSE,*templates.inc' .
+codespell --ignore-words-list=opton,inout,stap,allone,comute,fo,inforce,levle,onlyonce,opne --skip='./build,./.git,./fuzz/corpus,*.svg,./docs/commute.html,package-lock.json,*.jsonl,LICENSE,*templates.inc' .
 shellcheck "${scripts[@]}"
 # The page's JavaScript. Its checker comes from npm, in the versions that are pinned, and stays in the build folder.
 mkdir -p "$build/eslint"

@@ -7,11 +7,7 @@ namespace senseloom {
 inline constexpr OptionKey kStepCountKeys[] = {
     {.name = "mode", .defaultValue = 1, .range = {0, 1}, .merge = Merge::allOne},
     // A plain count, in hundreds of steps, not a logarithm, despite its name.
-    {.name = "logN",
-     .defaultValue = 1,
-     .range = {1, 100},
-     .outOfRange = OutOfRange::clamped,
-     .merge = Merge::minimum},
+    {.name = "logN", .defaultValue = 1, .range = {1, 100}, .outOfRange = OutOfRange::clamped, .merge = Merge::minimum},
 };
 inline constexpr OptionProperty kStepCountProperties[] = {{141, "mode"}, {142, "logN"}};
 inline constexpr OptionDescription kStepCount{

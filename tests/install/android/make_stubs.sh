@@ -14,8 +14,8 @@ names() {
   }' "$imports"
 }
 
-for library in $(awk '!/^(#|$|libc\+\+_static|libhardware|libgesture|libsenseloom)/ {print $1}' "$imports" | sort -u); do
-  names $library | "${clang[@]}" -shared -fuse-ld=lld -Wl,-soname,$library.so -x assembler - -o $library.so
+awk '!/^(#|$|libc\+\+_static|libhardware|libgesture|libsenseloom)/ {print $1}' "$imports" | sort -u | while read -r library; do
+  names "$library" | "${clang[@]}" -shared -fuse-ld=lld "-Wl,-soname,$library.so" -x assembler - -o "$library.so"
 done
 # Code that nobody calls, as most of an archive is.
 {

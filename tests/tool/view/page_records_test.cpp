@@ -10,8 +10,8 @@
 #include <utility>
 #include <vector>
 
-#include "view/packed_numbers.h"
 #include "view/levels.h"
+#include "view/packed_numbers.h"
 
 namespace senseloom::tool {
 namespace {

@@ -15,7 +15,7 @@ struct ExplanationForm {
   ExplanationExtent extent;
   bool json = false;
   FilterArguments filter = {};  // what is printed; the whole trace is explained
-  bool follows = false;  // a trace that is still written
+  bool follows = false;         // a trace that is still written
 };
 
 // Opens a session for each option string, "session 1" on, gives it the string, and explains every negotiation. Throws
