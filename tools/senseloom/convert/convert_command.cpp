@@ -13,6 +13,13 @@
 namespace senseloom::tool {
 namespace {
 
+constexpr char kFooter[] =
+    "--from csv: a table with a heading, and a row a decision, in order of time: cells between commas. The trace has a "
+    "record a row, dispatched to the sensor; times are rounded to milliseconds, unless their unit is shorter.\n"
+    "--to perfetto: trace events as JSON, for viewers of system traces. --to csv: a table with a row per call and "
+    "session, with what became of each record and why.\n"
+    "Exit status: 0; 1 when the output cannot be written; 2 for bad input.";
+
 struct ConvertArguments {
   std::string file;
   std::string from;
@@ -41,13 +48,7 @@ void convert(std::FILE* out, const ConvertArguments& arguments) {
 void declareConvert(CLI::App& app, Action& action) {
   CLI::App* command =
       app.add_subcommand("convert", "Make a trace of a table of decisions, or of a trace what others read.");
-  command->footer(
-      "--from csv: a table with a heading, and a row a decision, in order of time: cells between commas. The trace has "
-      "a "
-      "record a row, dispatched to the sensor; times are rounded to milliseconds, unless their unit is shorter.\n"
-      "--to perfetto: trace events as JSON, for viewers of system traces. --to csv: a table with a row per call and "
-      "session, with what became of each record and why.\n"
-      "Exit status: 0; 1 when the output cannot be written; 2 for bad input.");
+  command->footer(kFooter);
   auto arguments = std::make_shared<ConvertArguments>();
   command->add_option("FILE", arguments->file, "the table or the trace; - is standard input")
       ->required()
