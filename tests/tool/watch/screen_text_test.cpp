@@ -14,11 +14,11 @@ TEST(ScreenText, CountsCharactersAndNotBytes) {
 }
 
 TEST(ScreenText, IsShortenedWithAnEllipsis) {
-  EXPECT_EQ(shortenedTo(4, "four"), "four");
-  EXPECT_EQ(shortenedTo(3, "four"), "fo…");
+  EXPECT_EQ(shortenedTo(4, "walk"), "walk");
+  EXPECT_EQ(shortenedTo(3, "walk"), "wa…");
   EXPECT_EQ(shortenedTo(3, "éé€é"), "éé…");
-  EXPECT_EQ(shortenedTo(1, "four"), "…");
-  EXPECT_EQ(shortenedTo(0, "four"), "");
+  EXPECT_EQ(shortenedTo(1, "walk"), "…");
+  EXPECT_EQ(shortenedTo(0, "walk"), "");
 }
 
 TEST(ScreenText, CannotControlTheTerminal) {

@@ -36,7 +36,9 @@ std::string fieldsText(json_t* value) {
     text.append(text.empty() ? "" : " ").append(key).append(" ").append(fieldsText(item));
   }
   size_t index;
-  json_array_foreach(value, index, item) text.append(text.empty() ? "" : ", ").append(fieldsText(item));
+  json_array_foreach(value, index, item) {
+    text.append(text.empty() ? "" : ", ").append(fieldsText(item));
+  }
   return text;
 }
 
