@@ -13,7 +13,7 @@
 namespace senseloom::tool {
 namespace {
 
-constexpr char kFooter[] =
+constexpr char kFormatsHelp[] =
     "--from csv: a table with a heading, and a row a decision, in order of time: cells between commas. The trace has a "
     "record a row, dispatched to the sensor; times are rounded to milliseconds, unless their unit is shorter.\n"
     "--to perfetto: trace events as JSON, for viewers of system traces. --to csv: a table with a row per call and "
@@ -48,7 +48,7 @@ void convert(std::FILE* out, const ConvertArguments& arguments) {
 void declareConvert(CLI::App& app, Action& action) {
   CLI::App* command =
       app.add_subcommand("convert", "Make a trace of a table of decisions, or of a trace what others read.");
-  command->footer(kFooter);
+  command->footer(kFormatsHelp);
   auto arguments = std::make_shared<ConvertArguments>();
   command->add_option("FILE", arguments->file, "the table or the trace; - is standard input")
       ->required()
