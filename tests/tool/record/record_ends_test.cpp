@@ -158,5 +158,15 @@ TEST(RecordEnds, EndsWhatIsInterruptedWithAWholeFile) {
   EXPECT_NE(contentOf(folder.file("page")).find("</html>"), std::string::npos);
 }
 
+TEST(RecordEnds, KeepsOnlyTheWholeTracesOfATableThatIsInterrupted) {
+  const ScratchFolder folder("interrupted_table");
+  BackgroundProgram tool({TOOL_FILE, "convert", "--from", "csv", "--columns", "recording=who", "-o", folder.name, "-"});
+  tool.tell("who,time,class\nann,1,2\nben,1,2");
+  tool.waitUntilItWaits();
+  tool.send(SIGINT);
+  EXPECT_EQ(tool.finish().status, -1);
+  EXPECT_EQ(folder.files(), (std::vector<std::string>{"ann.jsonl"}));
+}
+
 }  // namespace
 }  // namespace senseloom::tool

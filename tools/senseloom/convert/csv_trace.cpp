@@ -7,12 +7,12 @@
 #include <charconv>
 #include <cstring>
 #include <limits>
-#include <memory>
 #include <optional>
-#include <stdexcept>
 #include <utility>
 
 #include "input_error.h"
+#include "terminal/interrupt.h"
+#include "terminal/output_sink.h"
 #include "trace/json.h"
 #include "trace/record_codec.h"
 #include "trace/time_unit.h"
@@ -36,8 +36,8 @@ int32_t numberFrom(const std::string& text, const std::string& column) {
   return number;
 }
 
-void print(std::FILE* out, const Json& object) {
-  std::fprintf(out, "%s\n", compactText(object.get()).c_str());
+void print(OutputSink& out, const Json& object) {
+  out.write(compactText(object.get()) + '\n');
 }
 
 // The file name of a recording's trace. Nothing that leads out of the folder.
@@ -52,8 +52,8 @@ std::string fileOf(const std::string& recording) {
 // Writes one trace. Timestamps are in milliseconds, unless those of the table are in a shorter unit.
 class TraceOfRows {
  public:
-  TraceOfRows(std::FILE* stream, const Sensor& records, int64_t tableUnit)
-      : out(stream), sensor(records), unit(std::min(tableUnit, kMillisecond)) {
+  TraceOfRows(OutputSink& sink, const Sensor& records, int64_t tableUnit)
+      : out(sink), sensor(records), unit(std::min(tableUnit, kMillisecond)) {
     Json note(json_object());
     addMember(note, member::kNote, Json(json_string("decisions from a table")));
     addMember(note, member::kTimeUnit, Json(json_string(timeUnitName(unit).c_str())));
@@ -86,7 +86,7 @@ class TraceOfRows {
   }
 
  private:
-  std::FILE* out;
+  OutputSink& out;
   const Sensor& sensor;
   const int64_t unit;
   int64_t lastTime = 0;
@@ -123,23 +123,16 @@ class Places {
   }
 };
 
-// Where the rows of the table go.
+// Where the rows of the table go. A trace gets its name in the folder when it is complete.
 class Traces {
  public:
-  Traces(const CsvConversion& wanted, std::FILE* standardOutput) : conversion(wanted) {
+  Traces(const CsvConversion& wanted, std::FILE* standardOutput) : conversion(wanted), out(standardOutput) {
     if (conversion.folder.empty()) {
-      trace.emplace(standardOutput, conversion.sensor, conversion.timeUnit);
+      begin("");
     } else if (mkdir(conversion.folder.c_str(), 0777) != 0 && errno != EEXIST) {
       throw InputError(conversion.folder + ": cannot be made: " + std::strerror(errno));
     }
   }
-
-  // A trace that is not complete is none.
-  ~Traces() {
-    if (file != nullptr) std::remove(name.c_str());
-  }
-  Traces(const Traces&) = delete;
-  Traces& operator=(const Traces&) = delete;
 
   void add(const std::vector<std::string>& cells, const Places& places) {
     if (cells.size() != places.width) {
@@ -154,16 +147,10 @@ class Traces {
 
   // All rows of the recording are written.
   void end() {
-    if (file == nullptr) return;
-    const bool isWritten = std::ferror(file.get()) == 0;
-    if (std::fclose(file.release()) != 0 || !isWritten) fail();
+    if (sink) sink->commit();
   }
 
  private:
-  struct CloseFile {
-    void operator()(std::FILE* opened) const { std::fclose(opened); }
-  };
-
   void select(const std::string& recording) {
     if (!recordings.empty() && recording == recordings.back()) return;
     if (std::ranges::find(recordings, recording) != recordings.end()) {
@@ -171,18 +158,18 @@ class Traces {
     }
     end();
     recordings.push_back(recording);
-    name = conversion.folder + '/' + fileOf(recording);
-    file.reset(std::fopen(name.c_str(), "w"));
-    if (file == nullptr) fail();
-    trace.emplace(file.get(), conversion.sensor, conversion.timeUnit);
+    begin(conversion.folder + '/' + fileOf(recording));
   }
 
-  [[noreturn]] void fail() const { throw std::runtime_error(name + ": cannot be written: " + std::strerror(errno)); }
+  void begin(const std::string& file) {
+    sink.emplace(out, file, conversion.file);
+    trace.emplace(*sink, conversion.sensor, conversion.timeUnit);
+  }
 
   const CsvConversion& conversion;
+  std::FILE* out;
   std::vector<std::string> recordings;  // so far
-  std::string name;                     // of the file
-  std::unique_ptr<std::FILE, CloseFile> file;
+  std::optional<OutputSink> sink;
   std::optional<TraceOfRows> trace;
 };
 
@@ -217,14 +204,18 @@ void convertCsv(std::FILE* out, const CsvConversion& conversion) {
   if (conversion.columns.recording.empty() != conversion.folder.empty()) {
     throw InputError("--columns recording=NAME and --output FOLDER go together: a trace for each recording");
   }
+  const InterruptMark mark;
   CsvReader table(conversion.file);
   try {
     const auto heading = table.next();
     if (heading.empty()) throw InputError("holds no table");
     const Places places(heading, conversion.columns);
     Traces traces(conversion, out);
-    for (auto cells = table.next(); !cells.empty(); cells = table.next()) traces.add(cells, places);
-    traces.end();
+    for (auto cells = table.next(); !cells.empty(); cells = table.next()) {
+      if (isInterrupted()) return;  // the trace of this recording is not complete
+      traces.add(cells, places);
+    }
+    if (!isInterrupted()) traces.end();
   } catch (const InputError& error) {
     throw InputError(table.position() + ": " + error.what());
   }
