@@ -25,11 +25,11 @@
 #include <utility>
 #include <vector>
 
-#include "sense/recording.h"
+#include "sense/motion_recording.h"
 
 namespace {
 
-using senseloom::tool::Recording;
+using senseloom::tool::MotionRecording;
 
 struct Interval {
   hub::Axes acceleration;
@@ -38,10 +38,10 @@ struct Interval {
 
 constexpr std::array<int, 8> kActivities = {0, 1, 2, 3, 1, 2, 0, 2};  // by label
 
-std::vector<Interval> intervalsOf(const Recording& recording) {
+std::vector<Interval> intervalsOf(const MotionRecording& recording) {
   std::vector<Interval> intervals;
   hub::Resampler resampler;
-  for (const Recording::Row& row : recording.rows) {
+  for (const MotionRecording::Row& row : recording.rows) {
     const bool isKnown = row.label >= 0 && row.label < static_cast<int>(kActivities.size());
     const int activity = isKnown ? kActivities[static_cast<std::size_t>(row.label)] : 0;
     for (const hub::Sample& interval : resampler.take(row.sample).intervals) {
@@ -83,20 +83,20 @@ void printRest(const std::vector<Interval>& intervals) {
   }
 }
 
-std::size_t recordsOf(const Recording& recording, const char* sensor, std::int32_t id, std::int32_t value) {
+std::size_t recordsOf(const MotionRecording& recording, const char* sensor, std::int32_t id, std::int32_t value) {
   std::array<std::uint8_t, sizeof value> bytes;
   std::memcpy(bytes.data(), &value, sizeof value);
   const hub::Property property{.id = id, .value = bytes};
   hub::Hub hub;
   hub.configure(sensor, {&property, 1});
   std::size_t count = 0;
-  for (const Recording::Row& row : recording.rows) count += hub.take(row.sample).size();
+  for (const MotionRecording::Row& row : recording.rows) count += hub.take(row.sample).size();
   return count;
 }
 
 void print(const char* file, const hub::ActivityModel& model) {
-  const Recording recording =
-      senseloom::tool::readRecording(file, senseloom::tool::recordingColumns("mm", "", ""), false);
+  const MotionRecording recording =
+      senseloom::tool::readMotionRecording(file, senseloom::tool::recordingColumns("mm", "", ""), false);
   const auto intervals = intervalsOf(recording);
   std::printf("recording %s\n", file);
   printActivities<128>(intervals, model);

@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdint>
 #include <list>
 #include <string>
@@ -58,17 +59,19 @@ class Reasons : public testing::Test {
     items += outcome.why.items;
     return outcome.why.verdict.text();
   }
-  // Records with a little-endian value of up to 8 bytes at byte 8.
   // What is told of all items so far, a count a line.
   static std::string told(const ItemCounts& counts) {
     std::string text;
     for (const ItemCount& count : counts.told()) text += (count.isLoss ? "lost: " : "") + count.text + '\n';
     return text;
   }
+  // A record with a little-endian value at byte 8, and zeros behind it if the size is more than the value's.
   static Bytes valued(int64_t value, size_t size, uint8_t timestamp = 1) {
     Bytes record(8 + size);
     record[0] = timestamp;
-    for (size_t i = 0; i < size; ++i) record[8 + i] = static_cast<uint8_t>(static_cast<uint64_t>(value) >> 8 * i);
+    for (size_t i = 0; i < std::min(size, sizeof value); ++i) {
+      record[8 + i] = static_cast<uint8_t>(static_cast<uint64_t>(value) >> 8 * i);
+    }
     return record;
   }
   static Bytes classes(const std::vector<uint8_t>& ids) {

@@ -41,9 +41,12 @@ std::string entry(const std::string& name, const std::string& text) {
   return start + '\n' + wrapped(text, "", kNameWidth);
 }
 
+// In order of their names: the set has them by their addresses.
 std::string namesOf(const std::set<CLI::Option*>& options) {
+  std::set<std::string> sorted;
+  for (const CLI::Option* option : options) sorted.insert(option->get_name());
   std::string names;
-  for (const CLI::Option* option : options) names += (names.empty() ? "" : ", ") + option->get_name();
+  for (const std::string& name : sorted) names += (names.empty() ? "" : ", ") + name;
   return names;
 }
 

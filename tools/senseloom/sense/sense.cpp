@@ -8,7 +8,7 @@
 #include <string_view>
 
 #include "input_error.h"
-#include "sense/recording.h"
+#include "sense/motion_recording.h"
 #include "sense/sensing_run.h"
 #include "terminal/new_file.h"
 #include "terminal/output_sink.h"
@@ -35,15 +35,15 @@ void checkSessions(const SensingArguments& arguments) {
 }
 
 // The rows of all recordings, one after another.
-std::vector<Recording::Row> readAll(const SensingArguments& arguments) {
+std::vector<MotionRecording::Row> readAll(const SensingArguments& arguments) {
   const bool takesRate = needsRate(arguments.clients);
-  std::vector<Recording::Row> rows;
+  std::vector<MotionRecording::Row> rows;
   for (const std::string& file : arguments.recordings) {
-    Recording recording = readRecording(file, arguments.columns, takesRate);
+    MotionRecording recording = readMotionRecording(file, arguments.columns, takesRate);
     for (const std::string& remark : recording.remarks) std::fprintf(stderr, "senseloom: %s\n", remark.c_str());
     const int64_t shift =
         rows.empty() ? 0 : rows.back().sample.time + kBetweenRecordings - recording.rows.front().sample.time;
-    for (Recording::Row& row : recording.rows) {
+    for (MotionRecording::Row& row : recording.rows) {
       row.sample.time += shift;
       rows.push_back(row);
     }

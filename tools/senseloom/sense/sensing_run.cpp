@@ -50,12 +50,12 @@ SensingRun::SensingRun(Write toTrace, const SensingArguments& given)
   plot.emplace();
 }
 
-void SensingRun::run(const std::vector<Recording::Row>& rows) {
+void SensingRun::run(const std::vector<MotionRecording::Row>& rows) {
   start();
   auto changes = arguments.changes;
   std::ranges::stable_sort(changes, {}, &SensingChange::after);
   auto next = changes.begin();
-  for (const Recording::Row& row : rows) {
+  for (const MotionRecording::Row& row : rows) {
     const int64_t after = row.sample.time - rows.front().sample.time;
     for (; next != changes.end() && next->after <= after; ++next) change(*next);
     for (const hub::Record& record : hub.take(row.sample)) dispatch(record, row.label);

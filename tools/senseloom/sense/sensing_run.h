@@ -10,7 +10,7 @@
 #include <vector>
 
 #include "plot/plot.h"
-#include "sense/recording.h"
+#include "sense/motion_recording.h"
 #include "sense/sense.h"
 #include "trace/class_names.h"
 #include "trace/json.h"
@@ -28,7 +28,7 @@ class SensingRun final : private ReplayObserver {
   SensingRun(Write toTrace, const SensingArguments& given);
 
   // Throws InputError.
-  void run(const std::vector<Recording::Row>& rows);
+  void run(const std::vector<MotionRecording::Row>& rows);
 
  private:
   void start();

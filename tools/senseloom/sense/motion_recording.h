@@ -12,7 +12,7 @@
 namespace senseloom::tool {
 
 // What a phone's sensors said while a person carried it.
-struct Recording {
+struct MotionRecording {
   struct Row {
     hub::Sample sample;
     int32_t label;  // what the person really did; 0: nobody knows
@@ -30,6 +30,6 @@ inline constexpr int64_t kBetweenRecordings = 1'000'000;
 // Reads a table with a heading and a row a sample: numbers between commas, semicolons or tabs. Rows that are a little
 // out of order are put in order. Throws InputError, with the file, the line and the column, for what is no recording
 // that a hub can sense from; `needsRate`: without angular rates it cannot.
-Recording readRecording(const std::string& file, const RecordingColumns& columns, bool needsRate);
+MotionRecording readMotionRecording(const std::string& file, const RecordingColumns& columns, bool needsRate);
 
 }  // namespace senseloom::tool

@@ -1,4 +1,4 @@
-#include "sense/recording.h"
+#include "sense/motion_recording.h"
 
 #include <algorithm>
 #include <charconv>
@@ -14,7 +14,7 @@
 namespace senseloom::tool {
 namespace {
 
-using Row = Recording::Row;
+using Row = MotionRecording::Row;
 
 constexpr int64_t kSlowest = 51'000;      // microseconds from sample to sample: 20 a second, with some play
 constexpr int64_t kMostBack = 1'000'000;  // that a row may be out of order, in microseconds
@@ -177,7 +177,7 @@ class Mender {
     recording.rows = std::move(rows);
   }
 
-  Recording mend() {
+  MotionRecording mend() {
     putPartsApart();
     leaveOutZeros();
     putInOrder();
@@ -268,12 +268,12 @@ class Mender {
   const std::string name;
   const RecordingColumns& columns;
   const bool needsRate;
-  Recording recording;
+  MotionRecording recording;
 };
 
 }  // namespace
 
-Recording readRecording(const std::string& file, const RecordingColumns& columns, bool needsRate) {
+MotionRecording readMotionRecording(const std::string& file, const RecordingColumns& columns, bool needsRate) {
   return Mender(file, columns, needsRate, RowReader(file, columns, needsRate).read()).mend();
 }
 
