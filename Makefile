@@ -2,7 +2,7 @@
 SHELL := /bin/bash
 
 .DEFAULT_GOAL := demo
-.PHONY: demo test install packages check-packages release accuracy bench bench-count fuzz coverage memcheck mutants lint
+.PHONY: demo test sanitize install packages check-packages release accuracy bench bench-count fuzz coverage memcheck mutants lint
 .SILENT:
 
 # $(call build,PRESET,CMAKE ARGUMENTS,TARGET): quietly but for where it is done, unless it fails.
@@ -19,14 +19,23 @@ demo:
 	$(call build,$$preset,-DBUILD_TESTING=OFF); \
 	scripts/demo.sh build/$$preset/bin/senseloom
 
-# Builds and tests everything: both word sizes, optimised and under sanitizers.
-test:
+# $(call run_tests,PRESETS)
+define run_tests
 	$(call install,build test)
-	for preset in $$(scripts/host-presets.sh x86 native asan-x86 asan-native); do \
+	for preset in $$(scripts/host-presets.sh $(1)); do \
 	  echo "== $$preset"; \
 	  $(call build,$$preset,-DBUILD_TESTING=ON); \
 	  ctest --preset $$preset || exit 1; \
 	done
+endef
+
+# Builds and tests everything: both word sizes, and the product's under sanitizers, too.
+test:
+	$(call run_tests,x86 native asan-x86)
+
+# The same under sanitizers in the host's word size.
+sanitize:
+	$(call run_tests,asan-native)
 
 # Installs the library in the host's word size, the tool and the documentation below PREFIX. BUILD is the folder to build
 # them in.

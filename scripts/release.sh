@@ -22,7 +22,7 @@ notes=$(awk '/^## / { ++sections; next } sections == 1' CHANGELOG.md)
 grep -q '^- ' <<<"$notes" || refuse "CHANGELOG.md says nothing about $version"
 
 commit=$(git rev-parse HEAD)
-"${1:-make}" test lint check-packages || refuse "a test failed"
+"${1:-make}" test sanitize lint check-packages || refuse "a test failed"
 check_tree
 [ "$(git rev-parse HEAD)" = "$commit" ] || refuse "another commit was checked out meanwhile"
 

@@ -15,7 +15,7 @@ printf '#define SENSELOOM_VERSION_%s\n' "MAJOR 2" "MINOR 5 /**< . */" "PATCH 1" 
 cat >passes <<'END'
 #!/bin/sh
 mkdir -p build/packages && touch build/packages/senseloom_2.5.1_amd64.deb build/packages/senseloom_2.5.0_amd64.deb
-[ "$*" = "test lint check-packages" ]
+[ "$*" = "test sanitize lint check-packages" ]
 END
 printf '#!/bin/sh\nexit 1\n' >fails
 chmod +x passes fails
