@@ -34,7 +34,7 @@ class ActivityClassifier {
   // Takes the acceleration in the next interval. A decision each kHop intervals, from the first whole window on.
   std::optional<Activity> take(const Axes& acceleration);
   // Of the window that the last decision is about.
-  std::int64_t variance() const { return window.variance() / (kSmoothed * kSmoothed); }
+  std::int64_t variance() const { return window.variance() / std::int64_t{kSmoothed * kSmoothed}; }
 
  private:
   static constexpr std::size_t kSmoothed = 5;

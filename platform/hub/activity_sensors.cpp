@@ -16,7 +16,7 @@ constexpr std::int32_t kAllInstantClasses = 15;
 }  // namespace
 
 void ActivitySensor::configure(Properties properties) {
-  const std::uint32_t span = std::max(integerOf(properties, kSpans, 1) & 0xffff, 1);
+  const auto span = static_cast<std::uint32_t>(std::max(integerOf(properties, kSpans, 1) & 0xffff, 1));
   perRecord = static_cast<std::size_t>(std::clamp(integerOf(properties, kDecisionsPerSpan, 1), 1, 256));
   step = std::max(span / static_cast<std::uint32_t>(perRecord), 1U);
   items.clear();
