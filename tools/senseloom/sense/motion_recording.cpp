@@ -9,7 +9,7 @@
 
 #include "input_error.h"
 #include "resampler.h"
-#include "sense/text_lines.h"
+#include "trace/text_lines.h"
 
 namespace senseloom::tool {
 namespace {
@@ -19,7 +19,6 @@ using Row = MotionRecording::Row;
 constexpr int64_t kSlowest = 51'000;      // microseconds from sample to sample: 20 a second, with some play
 constexpr int64_t kMostBack = 1'000'000;  // that a row may be out of order, in microseconds
 constexpr double kMostTime = 9e15;        // microseconds: 285 years
-constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";
 
 std::string quoted(const std::string& text) {
   return "column \"" + text + '"';
@@ -74,17 +73,12 @@ class RowReader {
       if (rows.empty()) throw InputError("holds a heading, but no samples");
       return rows;
     } catch (const InputError& error) {
-      throw InputError(position() + ": " + error.what());
+      throw InputError(lines.position() + ": " + error.what());
     }
   }
 
  private:
-  std::string position() const {
-    return lines.fileName() + (lines.lineNumber() == 0 ? "" : ':' + std::to_string(lines.lineNumber()));
-  }
-
   void readHeading(std::string_view line) {
-    if (line.starts_with(kByteOrderMark)) line.remove_prefix(kByteOrderMark.size());
     separator = separatorOf(std::string(line));
     const auto heading = cellsOf(line, separator);
     width = heading.size();

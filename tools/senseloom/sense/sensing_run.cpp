@@ -17,16 +17,12 @@ namespace {
 
 constexpr char kClose[] = "close";
 
-Json text(const std::string& value) {
-  return Json(json_string(value.c_str()));
-}
-
 // By its fields, if they say all that it holds.
 Json recordJson(const Sensor& sensor, const hub::Record& record) {
   const bool isWhole = sensor.items != Items::samples && sensor.bytesProperty < 0;
   if (isWhole) return decodeRecord(sensor, record.bytes);
   Json bytes(json_object());
-  addMember(bytes, member::kHex, text(toHex(record.bytes)));
+  addMember(bytes, member::kHex, textJson(toHex(record.bytes)));
   return bytes;
 }
 
@@ -37,7 +33,7 @@ bool hasActivities(const Sensor& sensor) {
 
 Json callLine(CallKind kind) {
   Json line(json_object());
-  addMember(line, member::kCall, text(callName(kind)));
+  addMember(line, member::kCall, textJson(callName(kind)));
   return line;
 }
 
@@ -75,16 +71,16 @@ void SensingRun::start() {
   Json line(json_object());
   std::string sources;
   for (const std::string& recording : arguments.recordings) sources += (sources.empty() ? "" : ", ") + recording;
-  addMember(line, member::kNote, text("sensed from " + sources));
-  addMember(line, member::kTimeUnit, text("ms"));
+  addMember(line, member::kNote, textJson("sensed from " + sources));
+  addMember(line, member::kTimeUnit, textJson("ms"));
   Json names(json_array());
-  for (const std::string& name : namesOfClasses()) json_array_append_new(names.get(), text(name).release());
+  for (const std::string& name : namesOfClasses()) json_array_append_new(names.get(), textJson(name).release());
   if (json_array_size(names.get()) > 0) addMember(line, member::kClassNames, std::move(names));
   write(line);
   for (const SensingClient& client : arguments.clients) {
     Json opening = callLine(CallKind::open);
-    addMember(opening, member::kSession, text(client.name));
-    addMember(opening, member::kSensor, text(client.sensor->name));
+    addMember(opening, member::kSession, textJson(client.name));
+    addMember(opening, member::kSensor, textJson(client.sensor->name));
     TraceCall call;
     call.kind = CallKind::open;
     call.session = client.name;
@@ -112,9 +108,9 @@ void SensingRun::change(const SensingChange& wanted) {
 
 void SensingRun::setOption(const std::string& session, const std::string& option) {
   Json line = callLine(CallKind::setOption);
-  addMember(line, member::kSession, text(session));
+  addMember(line, member::kSession, textJson(session));
   Json object(json_loads(option.c_str(), 0, nullptr));
-  addMember(line, member::kOption, json_is_object(object.get()) ? std::move(object) : text(option));
+  addMember(line, member::kOption, json_is_object(object.get()) ? std::move(object) : textJson(option));
   TraceCall call;
   call.kind = CallKind::setOption;
   call.session = session;
@@ -124,7 +120,7 @@ void SensingRun::setOption(const std::string& session, const std::string& option
 
 void SensingRun::close(const std::string& session) {
   Json line = callLine(CallKind::close);
-  addMember(line, member::kSession, text(session));
+  addMember(line, member::kSession, textJson(session));
   TraceCall call;
   call.kind = CallKind::close;
   call.session = session;
@@ -139,7 +135,7 @@ void SensingRun::dispatch(const hub::Record& record, int32_t label) {
   call.sensor = &sensor;
   call.record = recordJson(sensor, record);
   Json line = callLine(CallKind::dispatch);
-  addMember(line, member::kSensor, text(sensor.name));
+  addMember(line, member::kSensor, textJson(sensor.name));
   addMember(line, member::kRecord, Json(json_incref(call.record.get())));
   const auto known = arguments.labels.find(label);
   const int32_t truth = known == arguments.labels.end() ? label : known->second;

@@ -11,11 +11,6 @@
 namespace senseloom::tool {
 namespace {
 
-std::string textMember(const json_t* object, const char* key) {
-  const char* text = json_string_value(json_object_get(object, key));
-  return text == nullptr ? "" : text;
-}
-
 // Sessions are named s1, s2 and so on; s0 is one that came and went for the others to negotiate.
 uint32_t numberOf(const std::string& session) {
   return static_cast<uint32_t>(std::strtoul(session.c_str() + 1, nullptr, 10));

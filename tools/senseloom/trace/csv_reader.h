@@ -1,9 +1,9 @@
 #pragma once
 
-#include <cstddef>
-#include <fstream>
 #include <string>
 #include <vector>
+
+#include "trace/text_lines.h"
 
 namespace senseloom::tool {
 
@@ -12,19 +12,16 @@ namespace senseloom::tool {
 class CsvReader {
  public:
   // "-" is standard input. Throws InputError when the file cannot be opened.
-  explicit CsvReader(const std::string& file);
+  explicit CsvReader(const std::string& file) : lines(file) {}
 
   // The cells of the next row; none at the end. Throws InputError when a quote is not closed on its line.
   std::vector<std::string> next();
 
   // Where the last row was read, for messages: "FILE:LINE", or the file alone before the first one.
-  std::string position() const;
+  std::string position() const { return lines.position(); }
 
  private:
-  std::string name;
-  std::ifstream stream;
-  std::istream* input;
-  size_t lineNumber = 0;
+  TextLines lines;
 };
 
 }  // namespace senseloom::tool

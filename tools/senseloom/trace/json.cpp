@@ -37,4 +37,9 @@ Json textJson(const std::string& text) {
   return Json(json_stringn(shown.data(), shown.size()));
 }
 
+std::string textMember(const json_t* object, const char* key) {
+  const char* text = json_string_value(json_object_get(object, key));
+  return text == nullptr ? "" : text;
+}
+
 }  // namespace senseloom::tool

@@ -23,4 +23,7 @@ void appendElement(const Json& array, Json value);
 // A string. JSON cannot hold what is not UTF-8: if a text has such bytes, all beyond ASCII are shown as their numbers.
 Json textJson(const std::string& text);
 
+// The text of a member of an object; empty if it has none.
+std::string textMember(const json_t* object, const char* key);
+
 }  // namespace senseloom::tool

@@ -94,12 +94,8 @@ bool isNote(const Json& object) {
 }
 
 std::string noteText(const Json& note) {
-  const auto textOf = [&note](const char* key) {
-    const char* text = json_string_value(json_object_get(note.get(), key));
-    return std::string(text == nullptr ? "" : text);
-  };
-  const std::string why = textOf(member::kWhy);
-  return textOf(member::kNote) + (why.empty() ? "" : ": " + why);
+  const std::string why = textMember(note.get(), member::kWhy);
+  return textMember(note.get(), member::kNote) + (why.empty() ? "" : ": " + why);
 }
 
 TraceCall readCall(const Json& object) {

@@ -31,11 +31,6 @@ bool hasMember(const Json& object, const char* key) {
   return json_object_get(object.get(), key) != nullptr;
 }
 
-std::string textMember(const Json& object, const char* key) {
-  const char* text = json_string_value(json_object_get(object.get(), key));
-  return text == nullptr ? "" : text;
-}
-
 }  // namespace
 
 TraceReader::TraceReader(const std::string& file, Remark toRemark, Waiting whileWaiting)
@@ -136,7 +131,7 @@ bool TraceReader::readAboutRecording(const Json& object) {
 }
 
 void TraceReader::readNote(const Json& note) {
-  if (hasMember(note, member::kBreach)) remark(position() + ": " + textMember(note, member::kNote));
+  if (hasMember(note, member::kBreach)) remark(position() + ": " + textMember(note.get(), member::kNote));
   readAboutRecords(note);
 }
 
@@ -167,7 +162,7 @@ void TraceReader::readHead(const Json& object) {
   if (isRecording)
     throw InputError("another recording, or another part of it, begins here: each is a trace of its own");
   isRecording = true;
-  start = clockFromText(textMember(object, member::kStarted));
+  start = clockFromText(textMember(object.get(), member::kStarted));
   readAboutRecords(object);
 }
 
@@ -181,9 +176,9 @@ void TraceReader::readEnd(const Json& object) {
   const int64_t lost = integerMember(object, member::kLost);
   if (lost != 0) {
     remark(position() + ": " + std::to_string(lost) +
-           " lines could not be recorded: " + textMember(object, member::kWhy));
+           " lines could not be recorded: " + textMember(object.get(), member::kWhy));
   }
-  if (hasMember(object, member::kCause)) remark(position() + ": " + textMember(object, member::kCause));
+  if (hasMember(object, member::kCause)) remark(position() + ": " + textMember(object.get(), member::kCause));
 }
 
 std::nullopt_t TraceReader::end() {

@@ -10,7 +10,7 @@
 
 namespace senseloom::tool {
 
-// Reads a text a line at a time, from a file or standard input, plain or compressed.
+// Reads a text a line at a time, from a file or standard input, plain or compressed. A byte order mark is left out.
 class TextLines {
  public:
   // "-" is standard input. Throws InputError, with the name, when the file cannot be opened.
@@ -19,8 +19,8 @@ class TextLines {
   // Reads the next line, without its end. False at the end of the text. Throws InputError when it cannot be read.
   bool next(std::string& line);
 
-  // The file, for messages.
-  const std::string& fileName() const { return name; }
+  // Where the last line was read, for messages: "FILE:LINE", or the file alone before the first one.
+  std::string position() const;
   // The number of the last line, from 1 on.
   size_t lineNumber() const { return number; }
 

@@ -1,8 +1,9 @@
-#include "sense/text_lines.h"
+#include "trace/text_lines.h"
 
 #include <algorithm>
 
 #include "input_error.h"
+#include "trace/byte_order_mark.h"
 
 namespace senseloom::tool {
 
@@ -26,9 +27,13 @@ bool TextLines::next(std::string& line) {
     rest.remove_prefix(isWhole ? end + 1 : end);
   }
   if (!isWhole && line.empty()) return false;
-  ++number;
+  if (++number == 1 && line.starts_with(kByteOrderMark)) line.erase(0, kByteOrderMark.size());
   if (line.ends_with('\r')) line.pop_back();
   return true;
+}
+
+std::string TextLines::position() const {
+  return number == 0 ? name : name + ':' + std::to_string(number);
 }
 
 }  // namespace senseloom::tool
