@@ -1,5 +1,6 @@
 #include <gtest/gtest.h>
 
+#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <string>
@@ -36,6 +37,15 @@ TEST(Convert, MakesARecordOfEachRow) {
 
 TEST(Convert, KnowsTheColumnsByTheirUsualNames) {
   EXPECT_EQ(convert("class,time\n2,1\n").out,
+            kNote + dispatchOf("PHYAC", R"({"timestamp":1000,"items":[{"class":2,"seq":0}]})"));
+}
+
+TEST(Convert, ReadsACompressedTable) {
+  const ScratchFile plain("plain_table");
+  const ScratchFile compressed("compressed_table");
+  std::ofstream(plain.name) << "time,class\n1,2\n";
+  ASSERT_EQ(std::system(("gzip -c '" + plain.name + "' >'" + compressed.name + "'").c_str()), 0);
+  EXPECT_EQ(runTool({"convert", "--from", "csv", compressed.name}).out,
             kNote + dispatchOf("PHYAC", R"({"timestamp":1000,"items":[{"class":2,"seq":0}]})"));
 }
 
