@@ -60,18 +60,22 @@ class InMode : public OptionDTWGS {
   explicit InMode(int32_t mode) { settings.mode = mode; }
 };
 
-// What the options of several sessions come to, as the sensor merges them: all into a copy of the first. The number of
-// entries of the list, or the log line instead.
-std::string negotiated(const std::vector<int32_t>& modes) {
-  const auto merged = InMode(modes.front()).clone();
-  for (const int32_t mode : modes) merged->merge(InMode(mode));
+// The number of entries of the option's list, or the log line instead.
+std::string outcomeOf(Option& option) {
   ctx_option_t* list = nullptr;
-  merged->setProperty(&list);
+  option.setProperty(&list);
   const auto log = fake::platform().takeLog();
   std::string outcome = list != nullptr ? std::to_string(list->count) : "";
   if (!log.empty()) outcome += log[0].tag + ' ' + std::to_string(log[0].priority) + ' ' + log[0].text;
   ctx_option_release(list);
   return outcome;
+}
+
+// What the options of several sessions come to, as the sensor merges them: all into a copy of the first.
+std::string negotiated(const std::vector<int32_t>& modes) {
+  const auto merged = InMode(modes.front()).clone();
+  for (const int32_t mode : modes) merged->merge(InMode(mode));
+  return outcomeOf(*merged);
 }
 
 TEST(TemplateGestureOption, ModeTwoEnrollsToo) {
@@ -86,22 +90,29 @@ TEST(TemplateGestureOption, SessionsInModeTwoExcludeEachOtherAndTheOtherModes) {
 }
 
 TEST(TemplateGestureOption, StringEndsAConflictAndCountsAnew) {
-  InMode option(1);
-  option.merge(InMode(1));
-  option.merge(InMode(1));
+  for (const auto& [mode, outcome] : {std::pair(1, "0"), std::pair(2, "libsenseloom 3 option mode incompatible: 3")}) {
+    InMode option(mode);
+    for (int sessions = 0; sessions < 2; ++sessions) option.merge(InMode(mode));
+    EXPECT_EQ(outcomeOf(option), "libsenseloom 3 option invalid");
+    EXPECT_EQ(option.parse(R"({"mode":1})"), 0);
+    EXPECT_EQ(outcomeOf(option), "0");
+    option.merge(InMode(mode));
+    EXPECT_EQ(outcomeOf(option), outcome);
+  }
+}
+
+TEST_F(GestureTemplate, StringSetsTheValuesThatAListPointsAtToZero) {
+  OptionDTWGS option;
+  ASSERT_EQ(option.parse(R"({"mode":4,"classMask":2,"level":1,"template2":"0001ff"})"), 0);
   ctx_option_t* list = nullptr;
   option.setProperty(&list);
-  EXPECT_EQ(list, nullptr);
-  for (const int32_t mode : {1, 2}) {
-    EXPECT_EQ(option.parse(R"({"mode":1})"), 0);
-    option.merge(InMode(mode));
-  }
-  option.merge(InMode(0));
-  option.setProperty(&list);
-  EXPECT_EQ(list, nullptr) << "modes 1 and 2 together";
-  EXPECT_EQ(option.parse(R"({"mode":1})"), 0);
-  option.setProperty(&list);
-  EXPECT_NE(list, nullptr);
+  ASSERT_EQ(list->count, 3);
+  const auto at = [&](int entry) { return *static_cast<const int32_t*>(list->properties[entry].value); };
+  EXPECT_EQ(at(0), 1) << "level";
+  EXPECT_EQ(at(1), 1) << "number of the template";
+  EXPECT_EQ(option.parse(R"({"mode":4,"classMask":2,"level":1})"), 0);
+  EXPECT_EQ(at(0), 0);
+  EXPECT_EQ(at(1), 0);
   ctx_option_release(list);
 }
 
