@@ -24,7 +24,7 @@ constexpr size_t kBell = sizeof(uint32_t);  // the bytes of an order that the pr
 // The file that is the memory, by its name among the descriptors of the process.
 std::string findMemory(pid_t process) {
   const std::string title = "process " + std::to_string(process);
-  const std::string wanted = std::string("/memfd:") + trace::kControlName + " (deleted)";
+  const std::string wanted = "/memfd:" + std::string(trace::kControlName) + " (deleted)";
   std::error_code error;
   std::filesystem::directory_iterator descriptors("/proc/" + std::to_string(process) + "/fd", error);
   if (error) {
