@@ -12,16 +12,16 @@
 namespace senseloom::trace {
 namespace {
 
-constexpr uint64_t kPage = 4096;
+constexpr uint64_t kFilePage = 4096;
 constexpr uint64_t kAhead = 1 << 20;  // bytes that are reserved, and mapped, at once
 
 uint64_t roundedUp(uint64_t size) {
-  return (size + kPage - 1) / kPage * kPage;
+  return (size + kFilePage - 1) / kFilePage * kFilePage;
 }
 
 // Not every file system can reserve room; zeros that are written have it.
 bool writeZeros(int file, uint64_t from, uint64_t to) {
-  static constexpr char kZeros[kPage]{};
+  static constexpr char kZeros[kFilePage]{};
   while (from < to) {
     const ssize_t count = pwrite(file, kZeros, static_cast<size_t>(std::min<uint64_t>(sizeof kZeros, to - from)),
                                  static_cast<off_t>(from));
@@ -89,7 +89,7 @@ const char* MappedFile::reserve(uint64_t size) {
 const char* MappedFile::map(size_t size) {
   if (!isOpen()) return "the program closed the file, and it is gone";
   unmap();
-  windowStart = written / kPage * kPage;
+  windowStart = written / kFilePage * kFilePage;
   const auto room = static_cast<size_t>(roundedUp(std::max<uint64_t>(written - windowStart + size, kAhead)));
   void* memory =
       mmap(nullptr, room, PROT_READ | PROT_WRITE, MAP_SHARED, descriptor.get(), static_cast<off_t>(windowStart));

@@ -12,7 +12,7 @@
 namespace senseloom::trace {
 namespace {
 
-constexpr int kFlags = O_CLOEXEC | O_NOCTTY | O_NONBLOCK;
+constexpr int kStreamFlags = O_CLOEXEC | O_NOCTTY | O_NONBLOCK;
 constexpr int kPatience = 1000;  // milliseconds
 
 }  // namespace
@@ -53,12 +53,12 @@ OpenedSink openStream(const std::string& name, const struct stat& status) {
   if (!S_ISFIFO(status.st_mode) && !S_ISCHR(status.st_mode)) {
     return {nullptr, S_ISDIR(status.st_mode) ? std::strerror(EISDIR) : "neither a file nor a pipe nor a device"};
   }
-  int file = open(name.c_str(), O_WRONLY | kFlags);
+  int file = open(name.c_str(), O_WRONLY | kStreamFlags);
   if (file < 0) return {nullptr, std::strerror(errno)};
   if (S_ISFIFO(status.st_mode)) {
     // Whoever reads a pipe as well gets no signal when the other reader is gone.
     close(file);
-    file = open(name.c_str(), O_RDWR | kFlags);
+    file = open(name.c_str(), O_RDWR | kStreamFlags);
     if (file < 0) return {nullptr, std::strerror(errno)};
     if (const char* trouble = takeLock(file)) {
       close(file);
