@@ -85,15 +85,15 @@ TEST(Oracle, ExplainLeavesNothingUnexplainedInRandomSequencesOfCalls) {
   };
   const uint64_t seed = uint64_t{randomSeed()} << 32;
   size_t printed = 0;
-  for (uint64_t i = 0; i < SEQUENCES; ++i) {
+  for (uint64_t i = 0; i < EXPLAINED; ++i) {
     const std::string text = explained(sequenceOf(seed + i));
     printed += text.size();
     if (text.find("unexplained") == std::string::npos) continue;
     const Sequence least = shrink(sequenceOf(seed + i), isUnexplained);
-    FAIL() << "sequence " << i << " of " << SEQUENCES << "; the least of it that fails:\n"
+    FAIL() << "sequence " << i << " of " << EXPLAINED << "; the least of it that fails:\n"
            << toTrace(least) << explained(least);
   }
-  EXPECT_GT(printed, SEQUENCES * size_t{500});  // nothing is unexplained of what is not explained at all
+  EXPECT_GT(printed, EXPLAINED * size_t{500});  // nothing is unexplained of what is not explained at all
 }
 
 int countOf(const Sequence& sequence, Call::What what) {
