@@ -1,7 +1,8 @@
 // The gesture engine of a Linux host: recognises digits, or follows the script that is named in the environment
-// variable SENSELOOM_GESTURE_SCRIPT when the engine is started.
+// variable SENSELOOM_GESTURE_SCRIPT when the engine is started, or answers what it is told.
 
 #include <gesture.h>
+#include <gesture_answers.h>
 
 #include <cstdlib>
 #include <cstring>
@@ -16,6 +17,23 @@
 namespace {
 
 std::variant<std::monostate, gesture::Recogniser, gesture::Script> engine;  // the first while it is not started
+
+struct {
+  const char* const* names = nullptr;  // null: it is not told
+  int count = 0;
+  int nextGroup = 0;
+} told;
+
+const char* toldName() {
+  const int group = told.nextGroup++;
+  return group < told.count ? told.names[group] : nullptr;
+}
+
+const char* recognisedName(const int16_t* group, bool last) {
+  if (auto* const recogniser = std::get_if<gesture::Recogniser>(&engine)) return recogniser->take(group, last);
+  if (auto* const script = std::get_if<gesture::Script>(&engine)) return script->take(group, last);
+  return nullptr;
+}
 
 }  // namespace
 
@@ -35,9 +53,7 @@ bool gesture_initial(int, int) try {
 }
 
 char* gesture_process_single_data(const int16_t* group, int, bool last) {
-  const char* name = nullptr;
-  if (auto* const recogniser = std::get_if<gesture::Recogniser>(&engine)) name = recogniser->take(group, last);
-  if (auto* const script = std::get_if<gesture::Script>(&engine)) name = script->take(group, last);
+  const char* const name = told.names != nullptr ? toldName() : recognisedName(group, last);
   if (name == nullptr) return nullptr;
 
   const std::size_t size = std::strlen(name) + 1;
@@ -48,4 +64,8 @@ char* gesture_process_single_data(const int16_t* group, int, bool last) {
 
 void gesture_close() {
   engine.emplace<std::monostate>();
+}
+
+void gesture_answer_with(const char* const* names, int count) {
+  told = {.names = names, .count = count, .nextGroup = 0};
 }

@@ -1,6 +1,7 @@
 #include "headers_c99.h"
 
 #include <gesture.h>
+#include <gesture_answers.h>
 #include <hardware/aware.h>
 #include <hardware/hardware.h>
 

@@ -1,4 +1,5 @@
 #include <gesture.h>
+#include <gesture_answers.h>
 #include <gtest/gtest.h>
 
 #include <cstddef>
@@ -134,6 +135,28 @@ TEST_F(GestureEngine, RecognisesNothingBeforeItsStartAndAfterItsClose) {
   gesture_close();
   EXPECT_EQ(feed(true), kNone);
   gesture_close();
+}
+
+TEST_F(GestureEngine, AnswersWhatItIsToldStartedOrNot) {
+  const char* const names[] = {"LetterA ", nullptr, "LetterB "};
+  gesture_answer_with(names, 3);
+  EXPECT_EQ(feedRecords(4), (std::vector<Name>{"LetterA ", kNone, "LetterB ", kNone}));
+  gesture_answer_with(names, 1);
+  EXPECT_EQ(feedRecords(2), (std::vector<Name>{"LetterA ", kNone}));
+  gesture_answer_with(nullptr, 0);
+  EXPECT_EQ(feed(true), kNone);
+}
+
+TEST_F(GestureEngine, GoesOnWithTheScriptAfterItWasToldWhatToAnswer) {
+  writeScript("NumberOne \nNumberTwo \n");
+  ASSERT_TRUE(gesture_initial(0, 0));
+  EXPECT_EQ(feed(true), "NumberOne ");
+  const char* const name = "LetterA ";
+  gesture_answer_with(&name, 1);
+  EXPECT_EQ(feed(false), "LetterA ");
+  EXPECT_EQ(feed(true), kNone);
+  gesture_answer_with(nullptr, 0);
+  EXPECT_EQ(feed(true), "NumberTwo ");
 }
 
 TEST_F(GestureEngine, DoesNotStartWithoutTheFileOfTheScript) {
