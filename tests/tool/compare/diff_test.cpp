@@ -46,6 +46,18 @@ TEST(Diff, FindsTracesAlikeWhoseSessionsAreInAnotherOrder) {
   EXPECT_EQ(run.status, 0);
 }
 
+TEST(Diff, TellsWhatTheGestureEnginesAnswered) {
+  const std::string gesture = R"({"call":"dispatch","sensor":"GSPX","record":{"timestamp":1,"prx":0,"samples":[]})";
+  const std::string letters = R"(,"engine":[{"group":0,"name":"LetterA "},{"group":1,"name":"LetterB "}]})";
+  EXPECT_EQ(diff(gesture + letters, gesture + R"(,"engine":[]})").out,
+            "L:1 and R:1: dispatch to all of GSPX differs\n"
+            "  what            left                    right\n"
+            "  gesture engine  \"LetterA \", \"LetterB \"  nothing\n"
+            "  the first difference of this session: what follows may come of it\n");
+  EXPECT_EQ(diff(gesture + letters, gesture + letters).out, "1 calls compared, all alike\n");
+  EXPECT_EQ(diff(gesture + letters, gesture + '}').out, "1 calls compared, all alike\n");
+}
+
 constexpr char kRight[] = R"({"call":"open","session":"a","sensor":"STAP"}
 {"call":"open","session":"b","sensor":"GSFLK"}
 {"call":"set_option","session":"a","option":{"level":2},"returned":0,"properties":[{"id":101,"size":4,"value":"01000000"}]}

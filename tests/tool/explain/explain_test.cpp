@@ -113,6 +113,23 @@ TEST(ExplainTrace, KnowsThatSessionsFromBeforeAnUninitNegotiateWithNobody) {
             "  b        STAP          0          0                 0\n");
 }
 
+TEST(ExplainTrace, TellsWhatTheGestureEngineAnswered) {
+  const auto gesture = [](int time, const char* engine) {
+    return R"({"call":"dispatch","session":"a","record":{"timestamp":)" + std::to_string(time) +
+           R"(,"prx":0,"samples":[[1,2,3,4,5,6],[1,2,3,4,5,6]]},"engine":)" + engine + "}\n";
+  };
+  const ToolRun run =
+      runTool({"explain", "--records", "-"},
+              R"({"call":"open","session":"a","sensor":"GSPX"})"
+              "\n" +
+                  gesture(1, R"([{"group":1,"name":"LetterA "}])") +
+                  gesture(2, R"([{"group":0,"name":"LetterA "},{"group":1,"name":"LetterG "}])") + gesture(3, "[]"));
+  EXPECT_EQ(run.out.substr(0, run.out.find("\n\n")),
+            "line 2: a on GSPX delivered, where the gesture engine answered \"LetterA \"\n"
+            "line 3: a on GSPX delivered, where the gesture engine answered \"LetterA \", \"LetterG \"\n"
+            "line 4: a on GSPX no gesture recognised");
+}
+
 TEST(ExplainTrace, ExplainsASessionThatDoesNotOpen) {
   const ToolRun run = runTool({"explain", "--records", "-"}, R"({"call":"open","session":"a","sensor":"LPE_P"}
 {"call":"set_option","session":"a","option":{}}

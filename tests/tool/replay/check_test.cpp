@@ -141,6 +141,24 @@ TEST(ReplayCheck, SaysThatARecordingDoesNotHoldWhatTheGestureEngineAnswered) {
       << run.out;
 }
 
+TEST(ReplayCheck, AnswersTheLibraryAsTheRecordedGestureEngineDid) {
+  const std::string recording = R"({"call":"open","session":"a","sensor":"GSPX","returned":"handle"}
+{"call":"set_option","session":"a","option":"{\"classMask\":-1}","returned":0,"properties":[]}
+{"call":"dispatch","session":"a","record":{"timestamp":1,"prx":0,"samples":[[1,2,3,4,5,6],[1,2,3,4,5,6]]},"engine":[{"group":0,"name":"LetterA "},{"group":1,"name":"LetterG "}],"returned":1,"result":{"hex":"01000000000000000b001800010002000300040005000600010002000300040005000600"}}
+{"call":"dispatch","session":"a","record":{"timestamp":2,"prx":0,"samples":[[1,2,3,4,5,6]]},"engine":[],"returned":0}
+{"call":"dispatch","session":"a","record":{"timestamp":3,"prx":0,"samples":[[1,2,3,4,5,6]]},"returned":0}
+)";
+  // The script of the host's engine is for the records that the recording has no answers for.
+  const ToolRun run =
+      runTool({"replay", "--check", "-"}, recording, {{"SENSELOOM_GESTURE_SCRIPT", "gesture_hmm.script"}});
+  EXPECT_EQ(run.out,
+            "standard input:5: dispatch of session \"a\" differs from the recording\n"
+            "  what      recorded  now\n"
+            "  returned  0         1\n"
+            "  result    none      {\"timestamp\":3,\"class\":1}\n"
+            "  this is the first difference: what follows may come of it\n");
+}
+
 TEST(ReplayCheck, CountsCallsWithoutARecordedResult) {
   const ToolRun run = checkText(std::string(kRecording) + R"({"call":"uninit"})");
   EXPECT_EQ(run.out, "6 calls compared, all as recorded; 1 without a recorded result\n");

@@ -126,6 +126,23 @@ TEST(SweepReplay, StartsEachCombinationOfGesturesAfresh) {
   EXPECT_NE(rows[2].find("1028.6"), std::string::npos);
 }
 
+TEST(SweepReplay, HasTheGestureEngineAnswerAsRecorded) {
+  const auto gesture = [](const char* session, int time, const std::string& engine) {
+    return std::string(R"({"call":"dispatch","session":")") + session + R"(","record":{"timestamp":)" +
+           std::to_string(1000 * time) + R"(,"prx":0,"samples":[[1,2,3,4,5,6]]})" + engine + "}\n";
+  };
+  const std::string letter = R"(,"engine":[{"group":0,"name":"LetterA "}])";
+  // The first session's record is recognised, so that the second one's is not, or the other way round.
+  const std::string trace = R"({"call":"open","sensor":"GSPX","session":"a"}
+{"call":"open","sensor":"GSPX","session":"b"}
+)" + gesture("a", 1, letter) +
+                            gesture("b", 1, "") + gesture("b", 2, R"(,"engine":[])") + gesture("a", 2, "") +
+                            gesture("a", 3601, letter) + gesture("b", 3601, "");
+  for (const char* session : {"a", "b"}) {
+    EXPECT_EQ(resultsOf(trace, {"--session", session, "--set", "classMask=1024,1"}), "2 0") << session;
+  }
+}
+
 TEST(SweepReplay, EndsWhenASessionCannotBeOpened) {
   const ScratchFile modules("modules");
   std::filesystem::create_directory(modules.name);

@@ -45,6 +45,40 @@ TEST(TraceCall, DispatchesARecordToASensor) {
   EXPECT_EQ(call.sensor, findSensor("STAP"));
 }
 
+std::string dispatchWithEngine(const std::string& engine) {
+  return R"({"call":"dispatch","session":"a","record":{"hex":""},"engine":)" + engine + '}';
+}
+
+TEST(TraceCall, KnowsWhatTheGestureEngineAnswered) {
+  EXPECT_FALSE(callOf(R"({"call":"dispatch","session":"a","record":{"hex":""}})").engine);
+  const auto none = callOf(dispatchWithEngine("[]")).engine;
+  ASSERT_TRUE(none);
+  EXPECT_TRUE(none->empty());
+
+  const auto engine =
+      callOf(dispatchWithEngine(R"([{"group":0,"name":"LetterA "},{"group":169,"nameHex":"ff"}])")).engine;
+  ASSERT_TRUE(engine);
+  ASSERT_EQ(engine->size(), 2U);
+  EXPECT_EQ(engine->front().group, 0);
+  EXPECT_EQ(engine->front().name, "LetterA ");
+  EXPECT_EQ(engine->back().group, 169);
+  EXPECT_EQ(engine->back().name, "\xff");
+}
+
+TEST(TraceCall, RefusesAnswersThatNoGestureEngineGives) {
+  const auto engineErrorOf = [](const std::string& engine) { return errorOf(dispatchWithEngine(engine)); };
+  EXPECT_EQ(engineErrorOf("null"), "\"engine\" must be an array");
+  EXPECT_EQ(engineErrorOf("[7]"), "\"engine\" must hold objects");
+  EXPECT_EQ(engineErrorOf(R"([{"name":"LetterA "}])"), "missing \"group\"");
+  for (const char* group : {"-1", "170", "\"0\"", "1.0"}) {
+    EXPECT_EQ(engineErrorOf(std::string(R"([{"name":"LetterA ","group":)") + group + "}]"),
+              "\"group\" must be 0 to 169");
+  }
+  EXPECT_EQ(engineErrorOf(R"([{"group":0}])"), "missing \"name\"");
+  EXPECT_EQ(engineErrorOf(R"([{"group":0,"name":3}])"), "\"name\" must be a string");
+  EXPECT_EQ(engineErrorOf(R"([{"group":0,"nameHex":"0"}])"), "\"nameHex\" must hold hexadecimal digits, two a byte");
+}
+
 TEST(TraceCall, ClosesASessionWhateverElseItsLineHolds) {
   const TraceCall call = callOf(R"({"call":"close","session":"nav","note":"home","return":0})");
   EXPECT_EQ(call.kind, CallKind::close);

@@ -58,6 +58,17 @@ TEST(TraceLine, HasTheValuesOfPropertiesAsBytes) {
             "\n");
 }
 
+TEST(TraceLine, SaysWhatTheGestureEngineAnswered) {
+  TraceLine line;
+  line.addEngine({});
+  EXPECT_EQ(line.finish(), "{\"engine\":[]}\n");
+
+  line.clear();
+  line.addEngine(std::array<EngineAnswer, 2>{{{0, "LetterA "}, {25, "\xff"}}});
+  EXPECT_EQ(line.finish(), R"({"engine":[{"group":0,"name":"LetterA "},{"group":25,"nameHex":"ff"}]})"
+                           "\n");
+}
+
 TEST(TraceLine, NestsObjectsInArraysInObjects) {
   TraceLine line;
   line.beginObject("record");

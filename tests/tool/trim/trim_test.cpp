@@ -79,6 +79,28 @@ TEST(Trim, MakesAPartThatReplaysAsRecorded) {
   }
 }
 
+// Two sessions get each record. The second one's is not recognised anew.
+TEST(Trim, KeepsWhatTheGestureEngineAnsweredWithTheFirstSessionThatIsKept) {
+  const std::string open = R"({"call":"open","session":"a","sensor":"GSPX"}
+{"call":"open","session":"b","sensor":"GSPX"}
+)";
+  const auto gesture = [](const char* session, int time, const std::string& engine) {
+    return std::string(R"({"call":"dispatch","session":")") + session + R"(","record":{"timestamp":)" +
+           std::to_string(time) + R"(,"prx":0,"samples":[[1,2,3,4,5,6]]})" + engine + "}\n";
+  };
+  const std::string one = R"(,"engine":[{"group":0,"name":"NumberOne "}])";
+  const std::string none = R"(,"engine":[])";
+  const std::string trace = open + gesture("a", 1, one) + gesture("b", 1, "") + gesture("a", 2, none) +
+                            gesture("b", 2, "") + gesture("b", 2, "") + gesture("b", 3, "");
+  EXPECT_EQ(runTool({"trim", "-"}, trace).out, trace);
+  const ScratchFile file("gestures");
+  std::ofstream(file.name) << trace;
+  EXPECT_EQ(runTool({"trim", "--session", "b", file.name}).out,
+            open + gesture("b", 1, one) + gesture("b", 2, none) + gesture("b", 2, "") + gesture("b", 3, ""));
+  EXPECT_EQ(runTool({"trim", "--from", "6", file.name}).out,
+            open + gesture("b", 2, none) + gesture("b", 2, "") + gesture("b", 3, ""));
+}
+
 TEST(Trim, OverwritesNothing) {
   const ScratchFile file("kept");
   std::ofstream(file.name) << "kept";

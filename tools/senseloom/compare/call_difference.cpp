@@ -151,6 +151,9 @@ Differences callDifferences(const Sensor* sensor, const TraceCall& left, const T
     return encodeRecord(*sensor, call.record.get());
   };
   compareBytes(differences, sensor, decodeRecord, member::kRecord, record(left), record(right));
+  if (left.engine && right.engine) {
+    compare(differences, "gesture engine", answersText(*left.engine), answersText(*right.engine));
+  }
   if (left.recorded == nullptr || right.recorded == nullptr) return differences;
   const Differences outcomes = outcomeDifferences(sensor, left.recorded.get(), right.recorded.get());
   differences.insert(differences.end(), outcomes.begin(), outcomes.end());

@@ -9,6 +9,12 @@ namespace {
 // After so many negotiations only what changes is printed.
 constexpr size_t kFewNegotiations = 40;
 
+// What a recording says of the gesture engine's part in what became of a record.
+std::string engineText(const TraceCall& call) {
+  const bool hasAnswered = call.engine && !call.engine->empty();
+  return hasAnswered ? ", where the gesture engine answered " + answersText(*call.engine) : "";
+}
+
 }  // namespace
 
 void ExplanationText::onCall(const ExplainedCall& call) {
@@ -31,7 +37,8 @@ void ExplanationText::onRecord(const ExplainedRecord& record) {
   const bool isWanted = extent.problems ? record.isProblem() : extent.records || !record.unexplained.empty();
   if (!isWanted) return;
   printQuietCalls();
-  printLine(record.outcome, record.unexplained.empty() ? record.verdict.text() : "unexplained: " + record.unexplained);
+  const std::string what = record.unexplained.empty() ? record.verdict.text() : "unexplained: " + record.unexplained;
+  printLine(record.outcome, what + engineText(record.outcome.call));
 }
 
 void ExplanationText::onEnd(const std::vector<Account>& accounts) {

@@ -43,6 +43,7 @@ class CheckOutput final : public ReplayObserver {
   size_t different = 0;
   size_t unrecorded = 0;
   size_t inMiddle = 0;
+  bool hasEngine = false;                        // the recording holds what the gesture engine answered
   std::map<std::string, const Sensor*> resumed;  // sessions that may still be in the middle of a batch
 };
 

@@ -144,7 +144,9 @@ void ScriptReader::dispatch(const TraceCall& call) {
   for (const auto& [name, session] : sessions) {
     const bool gets = isForOne ? name == call.session : session.sensor == sensor;
     if (!gets || session.client == 0) continue;
-    addStep({.kind = CallKind::dispatch, .client = session.client, .record = script.foreign.size()}, sensor);
+    addStep(
+        {.kind = CallKind::dispatch, .client = session.client, .record = script.foreign.size(), .engine = call.engine},
+        sensor);
     script.foreign.push_back(store(bytes));
   }
 }
@@ -183,7 +185,7 @@ void ScriptReader::addRecord(const TraceCall& call, const std::vector<uint8_t>& 
     if (hasPrevious) previous.lasts = time - previous.time;
   }
   hasPrevious = true;
-  addStep({.kind = CallKind::dispatch, .record = script.records.size()}, client.sensor);
+  addStep({.kind = CallKind::dispatch, .record = script.records.size(), .engine = call.engine}, client.sensor);
   script.records.push_back(
       {.bytes = store(bytes), .time = time, .label = labelOf(call), .holdsItems = holdsItems(*client.sensor, bytes)});
 }

@@ -2,6 +2,8 @@
 
 #include <stdexcept>
 
+#include "trace/recorded_engine.h"
+
 namespace senseloom::tool {
 
 void SweepReplay::replay(const SweepScript& script) {
@@ -51,6 +53,7 @@ bool SweepReplay::setOption(const SweepStep& step) {
 }
 
 void SweepReplay::dispatch(const SweepScript& script, const SweepStep& step) {
+  const RecordedEngine engine(step.engine);
   if (step.client != 0) {
     static_cast<void>(sessions[step.client].dispatch(script.bytesAt(script.foreign[step.record])));
     return;

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "kinds/sensor_table.h"
+#include "trace/engine_answer.h"
 #include "trace/trace_form.h"
 
 namespace senseloom::tool {
@@ -37,6 +38,7 @@ struct SweepStep {
   std::optional<std::string> text = {};  // of a set_option by another client; nothing: a null pointer
   std::string head = {};                 // of a set_option by the swept client: its option before the swept members
   bool rebuilds = false;                 // if it negotiates, the swept session starts over
+  std::optional<std::vector<EngineAnswer>> engine = {};  // of a dispatch: what the gesture engine is to answer
 };
 
 // A trace, reduced to what a replay to one client takes.

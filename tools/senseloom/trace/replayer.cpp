@@ -6,6 +6,7 @@
 #include "input_error.h"
 #include "trace/record_codec.h"
 #include "trace/record_field.h"
+#include "trace/recorded_engine.h"
 
 namespace senseloom::tool {
 namespace {
@@ -78,7 +79,8 @@ void Replayer::perform(const TraceCall& call) {
     case CallKind::setOption:
       setOption(call, *require(call.session));
       break;
-    case CallKind::dispatch:
+    case CallKind::dispatch: {
+      const RecordedEngine engine(call.engine);
       if (call.sensor != nullptr) {
         dispatchToSensor(call);
       } else {
@@ -86,6 +88,7 @@ void Replayer::perform(const TraceCall& call) {
         dispatch(call, client, encodeRecord(*client.sensor, call.record.get()));
       }
       break;
+    }
     case CallKind::close:
       close(call, require(call.session));
       break;

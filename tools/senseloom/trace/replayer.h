@@ -45,7 +45,8 @@ class ReplayObserver {
   virtual void onEnd() {}
 };
 
-// Makes the calls of a trace, through the library's C interface, and reports the outcome of each to an observer.
+// Makes the calls of a trace, through the library's C interface, and reports the outcome of each to an observer. Where
+// the trace has what the platform's gesture engine answered, the library is answered the same.
 //
 // A session that failed to open keeps its name, with a null pointer as its handle: calls that name it are made, and
 // fail. It is not on its sensor, so a dispatch to the whole sensor leaves it out, and its name may be opened again.

@@ -45,14 +45,17 @@ const Sensor* sensorMember(const Json& object) {
   return &sensorNamed(stringMember(object, member::kSensor));
 }
 
-// An option given as a string reaches the library as it stands, whether it is JSON or not; one that no string can hold
-// is given as bytes.
+// A text that no string can hold is given as bytes.
+std::optional<std::string> hexMember(const Json& object, const char* key) {
+  if (json_object_get(object.get(), key) == nullptr) return std::nullopt;
+  const auto bytes = fromHex(stringMember(object, key));
+  if (!bytes) throw InputError(quoted(key) + " must hold hexadecimal digits, two a byte");
+  return std::string(bytes->begin(), bytes->end());
+}
+
+// An option given as a string reaches the library as it stands, whether it is JSON or not.
 std::optional<std::string> optionMember(const Json& object) {
-  if (json_object_get(object.get(), member::kOptionHex) != nullptr) {
-    const auto bytes = fromHex(stringMember(object, member::kOptionHex));
-    if (!bytes) throw InputError(quoted(member::kOptionHex) + " must hold hexadecimal digits, two a byte");
-    return std::string(bytes->begin(), bytes->end());
-  }
+  if (auto bytes = hexMember(object, member::kOptionHex)) return bytes;
   const json_t* option = requireMember(object, member::kOption);
   if (json_is_null(option)) return std::nullopt;
   if (json_is_string(option)) return json_string_value(option);
@@ -64,6 +67,28 @@ Json recordMember(const Json& object) {
   json_t* record = requireMember(object, member::kRecord);
   if (!json_is_object(record)) throw InputError(quoted(member::kRecord) + " must be an object");
   return Json(json_incref(record));
+}
+
+EngineAnswer engineAnswer(const Json& element) {
+  if (!json_is_object(element.get())) throw InputError(quoted(member::kEngine) + " must hold objects");
+  const json_t* group = requireMember(element, member::kGroup);
+  const json_int_t number = json_integer_value(group);
+  if (!json_is_integer(group) || number < 0 || number >= kMostGroups) {
+    throw InputError(quoted(member::kGroup) + " must be 0 to " + std::to_string(kMostGroups - 1));
+  }
+  auto name = hexMember(element, member::kNameHex);
+  return {.group = static_cast<int>(number), .name = name ? *std::move(name) : stringMember(element, member::kName)};
+}
+
+std::optional<std::vector<EngineAnswer>> engineMember(const Json& object) {
+  const json_t* engine = json_object_get(object.get(), member::kEngine);
+  if (engine == nullptr) return std::nullopt;
+  if (!json_is_array(engine)) throw InputError(quoted(member::kEngine) + " must be an array");
+  std::vector<EngineAnswer> answers;
+  for (size_t i = 0; i < json_array_size(engine); ++i) {
+    answers.push_back(engineAnswer(Json(json_incref(json_array_get(engine, i)))));
+  }
+  return answers;
 }
 
 void readTarget(const Json& object, TraceCall& call) {
@@ -116,6 +141,7 @@ TraceCall readCall(const Json& object) {
     case CallKind::dispatch:
       readTarget(object, call);
       call.record = recordMember(object);
+      call.engine = engineMember(object);
       call.truth = Json(json_incref(json_object_get(object.get(), member::kTruth)));
       break;
     case CallKind::close:

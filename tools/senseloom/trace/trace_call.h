@@ -4,8 +4,10 @@
 #include <cstdint>
 #include <optional>
 #include <string>
+#include <vector>
 
 #include "kinds/sensor_table.h"
+#include "trace/engine_answer.h"
 #include "trace/json.h"
 #include "trace/trace_form.h"
 
@@ -23,6 +25,8 @@ struct TraceCall {
   bool isResumed = false;                 // an open: the session was open before the recording
   Json recorded;                          // what a recording says of its outcome; null: nothing
   Json truth;                             // of a dispatch: the member of that name, whatever it is; null: there is none
+  // Of a dispatch: what the gesture engine answered; nothing: it was not asked, or nobody knows.
+  std::optional<std::vector<EngineAnswer>> engine;
 };
 
 // Whether a line's object is a note for readers, with no call.

@@ -29,6 +29,12 @@ inline constexpr char kOptionHex[] = "optionHex";
 inline constexpr char kRecord[] = "record";
 inline constexpr char kTruth[] = "truth";
 
+// What the platform's gesture engine answered during a dispatch.
+inline constexpr char kEngine[] = "engine";
+inline constexpr char kGroup[] = "group";
+inline constexpr char kName[] = "name";
+inline constexpr char kNameHex[] = "nameHex";
+
 // A note, or a head.
 inline constexpr char kTimeUnit[] = "timeUnit";
 inline constexpr char kClassNames[] = "classNames";

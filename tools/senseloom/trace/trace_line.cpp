@@ -92,6 +92,17 @@ void TraceLine::addProperty(int32_t id, std::span<const uint8_t> value) {
   endObject();
 }
 
+void TraceLine::addEngine(std::span<const EngineAnswer> answers) {
+  beginArray(member::kEngine);
+  for (const EngineAnswer& answer : answers) {
+    beginElement();
+    addInteger(member::kGroup, answer.group);
+    addText(member::kName, answer.name);
+    endObject();
+  }
+  endArray();
+}
+
 void TraceLine::addHexText(std::string_view key, std::span<const uint8_t> bytes) {
   addKey(key);
   addHex(bytes);

@@ -6,6 +6,8 @@
 #include <string>
 #include <string_view>
 
+#include "trace/engine_answer.h"
+
 namespace senseloom::tool {
 
 // One line of a trace, a JSON object, put together member by member. It is written by hand and into one buffer: a
@@ -37,6 +39,9 @@ class TraceLine {
   void addOpened(bool hasHandle);
   // An element of "properties": {"id","size","value"} with the value as hexadecimal digits.
   void addProperty(int32_t id, std::span<const uint8_t> value);
+
+  // "engine": {"group","name"} for each group of samples that a gesture was recognised at.
+  void addEngine(std::span<const EngineAnswer> answers);
 
   // A string of hexadecimal digits.
   void addHexText(std::string_view key, std::span<const uint8_t> bytes);

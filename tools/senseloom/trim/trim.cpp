@@ -14,6 +14,7 @@
 #include "terminal/new_file.h"
 #include "terminal/output_sink.h"
 #include "trace/record_codec.h"
+#include "trace/record_field.h"
 #include "trace/trace_reader.h"
 
 namespace senseloom::tool {
@@ -87,7 +88,9 @@ class Trimmer {
     const bool isBefore = !filter.isWithin(outcome);
     if (!isBefore) writeCarried();
     if (isBefore) carry(call, sensor);
+    if (call.engine) engine = {recordField<uint64_t>(record, kTimestampOffset), engineOfLine()};
     if (call.kind == CallKind::dispatch && !isWanted) return;
+    if (call.kind == CallKind::dispatch && sensor->items == Items::samples) return writeGesture(call, record);
     const bool isResumed =
         call.kind == CallKind::open && isBefore && call.recorded != nullptr && filter.takes(call.session, sensor);
     writeCall(isResumed ? changed([](const Json& line) { addMember(line, member::kResumed, Json(json_integer(1))); })
@@ -114,6 +117,22 @@ class Trimmer {
                            json_object_del(line.get(), member::kResult);
                          })});
     }
+  }
+
+  // The gesture engine is asked about a record once, whatever the number of its sessions. What it answered stays with
+  // the first of them that is kept.
+  void writeGesture(const TraceCall& call, std::span<const uint8_t> record) {
+    const bool isFirst =
+        engine.answers != nullptr && engine.timestamp == recordField<uint64_t>(record, kTimestampOffset);
+    Json answers = isFirst ? std::move(engine.answers) : nullptr;
+    writeCall(call.engine || answers == nullptr ? std::string(reader.line()) : changed([&](const Json& line) {
+      addMember(line, member::kEngine, std::move(answers));
+    }));
+  }
+
+  Json engineOfLine() const {
+    const Json object(json_loadb(reader.line().data(), reader.line().size(), 0, nullptr));
+    return Json(json_incref(json_object_get(object.get(), member::kEngine)));
   }
 
   void writeCarried() {
@@ -164,6 +183,10 @@ class Trimmer {
   std::optional<NewFile> target;
   std::map<std::string, const Sensor*> opened;  // sessions by name, as opened last
   std::vector<Carried> carried;
+  struct {
+    std::optional<uint64_t> timestamp;
+    Json answers;  // null: they are written
+  } engine;        // what it answered last, and for which record
   bool isRecording = false;
   size_t calls = 0;
 };
