@@ -1,5 +1,6 @@
 #include "carried_records.h"
 
+#include <map>
 #include <utility>
 
 namespace senseloom::trace {
@@ -15,14 +16,17 @@ void CarriedRecords::restarted(const std::vector<uint32_t>& restartedSessions) {
 
 void CarriedRecords::dispatched(uint32_t session, std::string_view line, bool gaveResult) {
   Carried& carried = sessions[session];
-  if (carried.newer.size() + line.size() > kMostKept) {
+  ++dispatches;
+  carried.newerSize += line.size();
+  if (carried.newerSize > kMostKept) {
     carried.newer.clear();
     carried.hasNewer = false;
-  } else if (carried.hasNewer) {
-    carried.newer += line;
+  } else {
+    carried.newer.push_back({dispatches, std::string(line)});
   }
   if (!gaveResult) return;
-  carried.older = std::exchange(carried.newer, "");
+  carried.older = std::exchange(carried.newer, {});
+  carried.newerSize = 0;
   carried.hasOlder = std::exchange(carried.hasNewer, true);
 }
 
@@ -32,16 +36,15 @@ bool CarriedRecords::isWhole(uint32_t session) const {
 }
 
 std::vector<std::string> CarriedRecords::lines() const {
-  std::vector<std::string> lines;
+  std::map<uint64_t, std::string> byNumber;
   for (const auto& [session, carried] : sessions) {
     if (!isWhole(session)) continue;
-    const std::string all = carried.older + carried.newer;
-    for (size_t start = 0; start < all.size();) {
-      const size_t end = all.find('\n', start) + 1;
-      lines.push_back(all.substr(start, end - start));
-      start = end;
+    for (const auto* lines : {&carried.older, &carried.newer}) {
+      for (const Line& line : *lines) byNumber.emplace(line.number, line.text);
     }
   }
+  std::vector<std::string> lines;
+  for (auto& [number, text] : byNumber) lines.push_back(std::move(text));
   return lines;
 }
 

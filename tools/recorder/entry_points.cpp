@@ -1,9 +1,12 @@
-// The library's names, as the program uses them: those that are recorded, and those that are only passed on.
+// The library's names, as the program uses them: those that are recorded, and those that are only passed on. And the
+// one of the platform's names, as the library uses it, whose answers are recorded.
+#include "engine.h"
 #include "library.h"
 #include "quick_sessions.h"
 #include "recorder.h"
 #include "senseloom.h"
 
+using senseloom::trace::engine;
 using senseloom::trace::gBell;
 using senseloom::trace::gQuickSessions;
 using senseloom::trace::library;
@@ -82,4 +85,12 @@ void* _va_del(varray_t* va, int index, void* out) noexcept {
 
 void va_free(varray_t* va) noexcept {
   library().vaFree(va);
+}
+
+// This library is before the platform's wherever names are looked for, since it needs the library that needs that one.
+char* gesture_process_single_data(const int16_t* group, int count, bool last) {
+  const auto process = engine();
+  char* const name = process == nullptr ? nullptr : process(group, count, last);
+  recorder().engineAnswered(name);
+  return name;
 }

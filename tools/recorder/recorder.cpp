@@ -61,7 +61,6 @@ auto Recorder::pass(CallKind kind, Before before, Make make, After after) noexce
   step([&] {
     begin(call);
     before(call);
-    call.arguments = call.line.text().size();
     call.isWhole = true;
     note(watch.entered(call.thread, callName(kind)));
   });
@@ -134,6 +133,7 @@ int Recorder::dispatch(void* handle, void* data, int len, void** out, int* outle
         note(watch.recordGiven(data, len, call.thread));
         watch.resultEnded(call.session.number);
         call.line.addBytes(member::kRecord, {static_cast<const uint8_t*>(data), static_cast<size_t>(len)});
+        asked = {.thread = call.thread};
       },
       [=] { return library().dispatchData(handle, data, len, out, outlen); },
       [=, this](Call& call, int returned) {
@@ -141,9 +141,9 @@ int Recorder::dispatch(void* handle, void* data, int len, void** out, int* outle
         if (call.session.number != 0) QuickSessions::count(*call.session.counts, gaveResult);
         if (!isRecording && call.session.number != 0) gQuickSessions.set(handle, call.session.counts);
         if (!call.isRecorded) return;
+        addEngineAnswers(call);
         if (call.hasResult && (order.maxSize != 0 || order.followForks)) {
-          const std::string repeated(call.line.text().substr(0, call.arguments));
-          carried.dispatched(call.session.number, repeated + "}\n", gaveResult);
+          carried.dispatched(call.session.number, std::string(call.line.text()) + "}\n", gaveResult);
         }
         if (!call.isAlone) return;
         call.line.addReturned(returned);
@@ -151,6 +151,17 @@ int Recorder::dispatch(void* handle, void* data, int len, void** out, int* outle
         call.line.addBytes(member::kResult, {static_cast<const uint8_t*>(*out), static_cast<size_t>(*outlen)});
         watch.resultGiven(call.session.number, *out, *outlen, data, call.thread);
       });
+}
+
+void Recorder::engineAnswered(const char* name) noexcept {
+  if (!isRecording) return;
+  step([=, this] {
+    if (asked.thread != currentThread()) return;  // somebody else's samples
+    const int group = asked.groups++;
+    if (name == nullptr || !std::exchange(asked.isWhole, false)) return;
+    asked.answers.push_back({.group = group, .name = name});
+    asked.isWhole = true;
+  });
 }
 
 int Recorder::close(void* handle, ctx_option_t** out) noexcept {
@@ -343,6 +354,12 @@ void Recorder::finish(Call& call) {
   // Also if the recording began meanwhile: what is open and asked for has to be in it.
   if (isRecording) writer->write(line, call.isNote ? LineKind::note : LineKind::call);
   spareLines.push_back(std::move(call.line));
+}
+
+// They are an argument as much as the record is: the library does what it does with both.
+void Recorder::addEngineAnswers(Call& call) {
+  if (call.isAlone && asked.groups != 0 && asked.isWhole) call.line.addEngine(asked.answers);
+  asked = {};
 }
 
 void Recorder::negotiated(Call& call, int returned, ctx_option_t** out) {

@@ -29,7 +29,8 @@ namespace senseloom::trace {
 
 // Makes the calls of the program and, while recording, writes them to a trace, one line each, when they have returned.
 // Each call is recorded in two steps: its arguments before it is made, since they may be in memory that it changes, and
-// then what it returned. Nothing is locked while the library runs.
+// then what it returned. Nothing is locked while the library runs, but for a moment when the gesture engine has
+// answered.
 //
 // Sessions are named s1, s2 and so on, in the order of the calls that opened them. What a trace cannot express (an
 // argument that is NULL, a handle that is not open, a sensor that does not exist) is written as a note, for readers
@@ -44,6 +45,9 @@ class Recorder {
   int close(void* handle, ctx_option_t** out) noexcept;
   int32_t release(ctx_option_t* list) noexcept;
   void uninit() noexcept;
+
+  // The platform's gesture engine has taken a group of samples, and recognised this name, or nothing: null.
+  void engineAnswered(const char* name) noexcept;
 
   void atExit() noexcept;
   void beforeFork() { mutex.lock(); }
@@ -65,10 +69,17 @@ class Recorder {
     bool isAlone = false;    // no other thread was in the library: what it has handed out is still there
     bool hasResult = false;  // whether the arguments give the result a place to go
     Session session = {};    // zeros: none that is open
-    size_t arguments = 0;    // bytes of the line
     int thread = 0;
     int64_t start = 0;
     int64_t end = 0;
+  };
+
+  // What the gesture engine answers during a dispatch.
+  struct EngineAnswers {
+    int thread = 0;  // of the dispatch; 0: none
+    int groups = 0;
+    bool isWhole = true;  // there was memory for the answers
+    std::vector<tool::EngineAnswer> answers = {};
   };
 
   // What is done before and after a call.
@@ -86,6 +97,7 @@ class Recorder {
   void begin(Call& call);
   void beginOnSession(Call& call, const void* handle, bool hasArguments);
   void finish(Call& call);
+  void addEngineAnswers(Call& call);
   void negotiated(Call& call, int returned, ctx_option_t** out);
   void tellState(std::string_view line);
   void tellStateAnew();
@@ -109,6 +121,7 @@ class Recorder {
   Summary summary;
   std::unique_ptr<TraceWriter> writer;  // there is one while it records
   CarriedRecords carried;
+  EngineAnswers asked;  // of the dispatch that began last
   ContractWatch watch;
   int64_t startedAt = 0;  // wall-clock nanoseconds
   int64_t startTime = 0;  // monotonic nanoseconds

@@ -103,6 +103,28 @@ TEST(RecordFiles, MakesPartsThatReplayAlone) {
   EXPECT_EQ(compared, kCalls);
 }
 
+// Parts end between the dispatches of a record to three sessions, of which the first has the gesture engine asked.
+TEST(RecordFiles, MakesPartsThatHoldWhatTheGestureEngineAnswered) {
+  const ScratchFolder folder("gesture_parts");
+  std::string calls;
+  for (const char* session : {"a", "b", "c"}) {
+    calls += std::string(R"({"call":"open","session":")") + session + R"(","sensor":"GSPX"}
+{"call":"set_option","session":")" +
+             session + R"(","option":{"classMask":-1}}
+)";
+  }
+  for (int time = 1; time <= 60; ++time) {
+    calls += R"({"call":"dispatch","sensor":"GSPX","record":{"timestamp":)" + std::to_string(time) +
+             R"(,"prx":0,"samples":[[1,2,3,4,5,6]]},"engine":[{"group":0,"name":")" +
+             (time % 2 == 0 ? "LetterA " : "LetterB ") + "\"}]}\n";
+  }
+  runTool({"record", "--max-size", "3k", "-o", folder.file("trace.jsonl"), "--", TOOL_FILE, "replay", "--quiet", "-"},
+          calls, recordingEnvironment());
+  EXPECT_GE(folder.files().size(), 10U);
+  for (const std::string& file : folder.files())
+    EXPECT_EQ(check(folder.file(file)).out.find("differs"), std::string::npos) << file;
+}
+
 TEST(RecordFiles, LeavesThePartsOfAnEarlierRecordingAlone) {
   const ScratchFolder folder("old_parts");
   std::ofstream(folder.file("trace.2.jsonl")) << "mine\n";

@@ -11,10 +11,13 @@
 namespace senseloom::tool {
 namespace {
 
-// What is recorded of the one session that each of the programs has.
-constexpr char kSession[] = R"({"call":"open","session":"s1","sensor":"LPE_P","returned":"handle"}
+// What is recorded of the sessions that each of the programs has. The gesture engine's script begins with that name.
+constexpr char kSessions[] = R"({"call":"open","session":"s1","sensor":"LPE_P","returned":"handle"}
 {"call":"dispatch","session":"s1","record":{"hex":"01000000000000000200"},"returned":1,"result":{"hex":"01000000000000000200"}}
 {"call":"close","session":"s1","returned":0}
+{"call":"open","session":"s2","sensor":"GSPX","returned":"handle"}
+{"call":"dispatch","session":"s2","record":{"hex":"010000000000000000000c00000000000000000000000000"},"engine":[{"group":0,"name":"NumberOne "}],"returned":1,"result":{"hex":"010000000000000001000c00000000000000000000000000"}}
+{"call":"close","session":"s2","returned":0}
 )";
 
 Environment withLibraryFolder() {
@@ -25,8 +28,8 @@ void expectRecorded(const std::vector<std::string>& command, const Environment& 
   const ScratchFile trace("kind");
   const ToolRun run = recordTo(trace.name, command, "", environment);
   EXPECT_EQ(run.status, 0) << run.err;
-  EXPECT_EQ(callsOf(contentOf(trace.name)), kSession);
-  EXPECT_EQ(check(trace.name).out, "3 calls compared, all as recorded\n");
+  EXPECT_EQ(callsOf(contentOf(trace.name)), kSessions);
+  EXPECT_EQ(check(trace.name).out, "6 calls compared, all as recorded\n");
 }
 
 TEST(RecordKinds, ALibraryThatIsLoadedByItsName) {
@@ -64,12 +67,13 @@ TEST(RecordKinds, ALibraryThatPythonLoads) {
   if (sizeof(void*) != 8) GTEST_SKIP() << "Python has the host's word size";
   const std::string program = std::string("import ctypes\nlibrary = ctypes.CDLL('") + LIBRARY_FILE + R"(')
 library.ctx_open_session.restype = ctypes.c_void_p
-session = ctypes.c_void_p(library.ctx_open_session(b'LPE_P'))
-record = ctypes.create_string_buffer(bytes.fromhex('01000000000000000200'), 10)
-result, size = ctypes.c_void_p(), ctypes.c_int()
-library.ctx_dispatch_data(session, record, 10, ctypes.byref(result), ctypes.byref(size))
-assert ctypes.c_bool.in_dll(library, 'gIsActivated').value
-library.ctx_close_session(session, ctypes.byref(result))
+for sensor, digits in (b'LPE_P', '01000000000000000200'), (b'GSPX', '010000000000000000000c00' + 24 * '0'):
+    session = ctypes.c_void_p(library.ctx_open_session(sensor))
+    record = ctypes.create_string_buffer(bytes.fromhex(digits), len(digits) // 2)
+    result, size = ctypes.c_void_p(), ctypes.c_int()
+    library.ctx_dispatch_data(session, record, len(digits) // 2, ctypes.byref(result), ctypes.byref(size))
+    assert ctypes.c_bool.in_dll(library, 'gIsActivated').value == (sensor == b'LPE_P')
+    library.ctx_close_session(session, ctypes.byref(result))
 )";
   expectRecorded({"/usr/bin/python3", "-c", program});
 }
@@ -81,10 +85,15 @@ TEST(RecordKinds, ALibraryThatTheRecordingLibraryStandsInThePlaceOf) {
   std::filesystem::create_symlink(LIBRARY_FILE, folder.file("libsenseloom-real.so"));
   Environment environment = recordingEnvironment();
   environment.emplace_back("LD_LIBRARY_PATH", folder.name);
-  environment.emplace_back("SENSELOOM_TRACE", folder.file("trace"));
-  const ToolRun run = runTool({"replay", "--quiet", "audio_classification.jsonl"}, "", environment);
-  EXPECT_EQ(run.status, 0) << run.err;
-  EXPECT_EQ(check(folder.file("trace")).status, 0);
+  environment.emplace_back("SENSELOOM_TRACE", folder.file("%p"));
+  for (const char* trace : {"audio_classification.jsonl", "gesture_hmm.jsonl"}) {
+    const ToolRun run = runTool({"replay", "--quiet", trace}, "", environment);
+    EXPECT_EQ(run.status, 0) << run.err;
+  }
+  auto traces = folder.files();
+  std::erase_if(traces, [](const std::string& name) { return name.starts_with("lib"); });
+  EXPECT_EQ(traces.size(), 2U);
+  for (const std::string& name : traces) EXPECT_EQ(check(folder.file(name)).status, 0);
 }
 
 TEST(RecordKinds, RefusesAProgramThatIsLinkedStatically) {

@@ -40,6 +40,17 @@ TEST(Record, RecordsAProgramThatUsesTheLibrary) {
   EXPECT_EQ(check(trace.name).out, "14 calls compared, all as recorded; 1 without a recorded result\n");
 }
 
+TEST(Record, HoldsWhatTheGestureEngineAnsweredAlsoWhenThatWasRecorded) {
+  const ScratchFile first("gestures");
+  const ScratchFile second("gestures_again");
+  recordTo(first.name, {TOOL_FILE, "replay", "gesture_hmm.jsonl"});
+  recordTo(second.name, {TOOL_FILE, "replay", first.name}, "", {{"SENSELOOM_GESTURE_SCRIPT", "/dev/null"}});
+  const std::string calls = callsOf(contentOf(first.name));
+  EXPECT_NE(calls.find(R"("engine":[{"group":2,"name":"NumberOne "}],"returned":1)"), std::string::npos) << calls;
+  EXPECT_NE(calls.find(R"("engine":[],"returned":0)"), std::string::npos) << calls;
+  EXPECT_EQ(callsOf(contentOf(second.name)), calls);
+}
+
 TEST(Record, PassesTheExitStatusAndTheArgumentsOn) {
   const ScratchFile trace("arguments");
   const ToolRun run = recordTo(trace.name, {TOOL_FILE, "replay", "--json", "--", "-"}, "stop\n");

@@ -42,6 +42,20 @@ TEST(CarriedRecordsTest, OfASessionThatWasOpenBeforeAreKnownAfterTwoResults) {
   EXPECT_TRUE(carried.isWhole(1));
 }
 
+TEST(CarriedRecordsTest, AreInTheOrderOfTheirDispatches) {
+  CarriedRecords carried;
+  const uint32_t sessions[] = {3, 1, 4, 2};
+  for (const uint32_t session : sessions) carried.opened(session);
+  Lines dispatched;
+  for (int record = 0; record < 3; ++record) {
+    for (const uint32_t session : sessions) {
+      dispatched.push_back(std::to_string(record) + " to " + std::to_string(session) + '\n');
+      carried.dispatched(session, dispatched.back(), session == 4 && record == 0);
+    }
+  }
+  EXPECT_EQ(carried.lines(), dispatched);
+}
+
 TEST(CarriedRecordsTest, AreGivenUpWhenTheyAreTooMany) {
   CarriedRecords carried;
   carried.opened(1);

@@ -43,7 +43,7 @@ ToolRun recordTo(const std::string& file, std::vector<std::string> command, cons
 // Records the driven program with these lines on its standard input; `options` are for the recording.
 ToolRun recordDriven(const std::string& file, const std::string& lines, std::vector<std::string> options = {});
 
-// Runs `senseloom replay --check FILE`, with the same gestures.
+// Runs `senseloom replay --check FILE`, where the gesture engine itself recognises nothing.
 ToolRun check(const std::string& file);
 
 // A recording without what is different each time: its head and its end, notes about its threads, and the times and

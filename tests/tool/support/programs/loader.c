@@ -39,6 +39,6 @@ int main(int argc, char** argv) {
   *(void**)&library.open_session = dlsym(handle, "ctx_open_session");
   *(void**)&library.dispatch_data = dlsym(handle, "ctx_dispatch_data");
   *(void**)&library.close_session = dlsym(handle, "ctx_close_session");
-  const int failure = use_session(&library);
+  const int failure = use_sessions(&library);
   return failure != 0 ? failure : use_audio(handle);
 }

@@ -4,5 +4,5 @@
 int run_plugin(void);
 int run_plugin(void) {
   const struct functions library = {ctx_open_session, ctx_dispatch_data, ctx_close_session};
-  return use_session(&library);
+  return use_sessions(&library);
 }
