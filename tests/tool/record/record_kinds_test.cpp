@@ -96,6 +96,17 @@ TEST(RecordKinds, ALibraryThatTheRecordingLibraryStandsInThePlaceOf) {
   for (const std::string& name : traces) EXPECT_EQ(check(folder.file(name)).status, 0);
 }
 
+// There the library does not find the recording library's function, and does what it does without it.
+TEST(RecordKinds, AProgramThatHasAGestureEngineBeforeTheLibrary) {
+  const ScratchFile trace("own_engine");
+  const std::string engine = std::filesystem::path(LIBRARY_FILE).parent_path() / "libgesture.so";
+  const std::string program = "LD_PRELOAD=" + engine + ' ' + TOOL_FILE + " replay --quiet gesture_hmm.jsonl";
+  const ToolRun run = recordTo(trace.name, {"sh", "-c", program});
+  EXPECT_EQ(run.out, runTool({"replay", "--quiet", "gesture_hmm.jsonl"}, "", recordingEnvironment()).out) << run.err;
+  EXPECT_EQ(contentOf(trace.name).find("engine"), std::string::npos);
+  EXPECT_NE(check(trace.name).out.find("does not hold what the platform's gesture engine answered"), std::string::npos);
+}
+
 TEST(RecordKinds, RefusesAProgramThatIsLinkedStatically) {
   const ScratchFile trace("static");
   const ToolRun run = recordTo(trace.name, {STATIC_FILE});
