@@ -158,7 +158,7 @@ void Recorder::engineAnswered(const char* name) noexcept {
   step([=, this] {
     if (asked.thread != currentThread()) return;  // somebody else's samples
     const int group = asked.groups++;
-    if (name == nullptr || !std::exchange(asked.isWhole, false)) return;
+    if (name == nullptr || !std::exchange(asked.isWhole, false)) return;  // stays so if there is no memory
     asked.answers.push_back({.group = group, .name = name});
     asked.isWhole = true;
   });
