@@ -3,6 +3,7 @@
 extern "C" {
 #endif
 #define RTLD_LAZY 1
+#define RTLD_NEXT ((void*)-1L)
 typedef struct {
   const char* dli_fname;
   void* dli_fbase;
