@@ -116,10 +116,28 @@ TEST(TraceCall, HasItsRecordedOutcome) {
   EXPECT_EQ(recorded(R"(,"properties":[])"), "nothing");
 }
 
+TEST(TraceCall, HasTheNumberOfTheListThatItGave) {
+  EXPECT_EQ(callOf(R"({"call":"close","session":"a","list":7})").list, 7);
+  EXPECT_EQ(callOf(R"({"call":"close","session":"a"})").list, 0);
+}
+
+TEST(TraceCall, KnowsWhichListIsReleased) {
+  const auto released = [](const std::string& list) {
+    const Json release = parsed(R"({"call":"release","list":)" + list + "}");
+    EXPECT_TRUE(isRelease(release));
+    return releasedList(release);
+  };
+  EXPECT_EQ(released("7"), 7);
+  EXPECT_EQ(released("\"unknown\""), 0);
+  EXPECT_EQ(released("null"), std::nullopt);
+  for (const char* wrong : {"0", "-1", "1.5", "\"\"", "[]"}) EXPECT_THROW(released(wrong), InputError) << wrong;
+  EXPECT_FALSE(isRelease(parsed(R"({"call":"close","list":7})")));
+}
+
 TEST(TraceCall, RefusesMissingAndMistypedMembers) {
   const std::pair<const char*, const char*> lines[] = {
       {R"({"call":1})", "\"call\" must be a string"},
-      {R"({"call":"opne"})", "unknown call \"opne\": open, set_option, dispatch, close and uninit are known"},
+      {R"({"call":"opne"})", "unknown call \"opne\": open, set_option, dispatch, close, uninit and release are known"},
       {R"({"call":"open","sensor":"STAP"})", "missing \"session\""},
       {R"({"call":"open","session":7,"sensor":"STAP"})", "\"session\" must be a string"},
       {R"({"call":"open","session":"","sensor":"STAP"})", "\"session\" must not be empty"},

@@ -145,6 +145,25 @@ TEST_F(TraceReading, SkipsNotesOnLinesOfTheirOwn) {
   EXPECT_FALSE(reader.next());
 }
 
+// It is not counted among the calls of a recording either.
+TEST_F(TraceReading, PassesReleasesOnAsideFromTheCalls) {
+  TraceReader reader = readerOf(kRecordingHead + kRecordedCall + R"({"call":"release","list":4,"atUs":5,"thread":1})" +
+                                "\n" + R"({"end":1,"lost":0})" + "\n");
+  std::vector<size_t> releases;
+  reader.listen([&](size_t line, const Json& aside) {
+    if (isRelease(aside)) releases.push_back(line);
+  });
+  EXPECT_TRUE(reader.next());
+  EXPECT_FALSE(reader.next());
+  EXPECT_EQ(releases, (std::vector<size_t>{3}));
+  EXPECT_EQ(remarks, "");
+}
+
+TEST_F(TraceReading, RefusesAReleaseThatNamesNoList) {
+  EXPECT_EQ(errorOf(R"({"call":"release"})"), "missing \"list\"");
+  EXPECT_EQ(errorOf(R"({"call":"release","list":"x"})"), "\"list\" must be the number of a list, null or \"unknown\"");
+}
+
 TEST_F(TraceReading, CountsTheBytesOfTheLinesReadAndOfTheFile) {
   TraceReader reader = readerOf("\n{\"call\":\"uninit\"}\n{\"call\":\"uninit\"}");
   EXPECT_EQ(reader.size(), 36U);

@@ -30,7 +30,7 @@ CallKind callMember(const Json& object) {
   const auto* call =
       std::find_if(kAllCalls.begin(), kAllCalls.end(), [&name](CallKind kind) { return name == callName(kind); });
   if (call == kAllCalls.end()) {
-    throw InputError("unknown call \"" + name + "\": open, set_option, dispatch, close and uninit are known");
+    throw InputError("unknown call \"" + name + "\": open, set_option, dispatch, close, uninit and release are known");
   }
   return *call;
 }
@@ -123,11 +123,24 @@ std::string noteText(const Json& note) {
   return textMember(note.get(), member::kNote) + (why.empty() ? "" : ": " + why);
 }
 
+bool isRelease(const Json& object) {
+  return textMember(object.get(), member::kCall) == kRelease;
+}
+
+std::optional<int64_t> releasedList(const Json& release) {
+  const json_t* list = requireMember(release, member::kList);
+  if (json_is_null(list)) return std::nullopt;
+  if (json_integer_value(list) > 0) return json_integer_value(list);
+  if (textMember(release.get(), member::kList) == kUnknownList) return 0;
+  throw InputError(quoted(member::kList) + " must be the number of a list, null or " + quoted(kUnknownList));
+}
+
 TraceCall readCall(const Json& object) {
   TraceCall call;
   call.kind = callMember(object);
   call.recorded = recordedMembers(object);
   if (const json_t* at = json_object_get(object.get(), member::kAt)) call.atMicroseconds = json_integer_value(at);
+  call.list = json_integer_value(json_object_get(object.get(), member::kList));
   switch (call.kind) {
     case CallKind::open:
       call.session = sessionMember(object);

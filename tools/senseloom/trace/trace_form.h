@@ -17,6 +17,10 @@ constexpr const char* callName(CallKind kind) {
   return kNames[static_cast<size_t>(kind)];
 }
 
+// The release of a property list. It is not one of the kinds, because no replay makes it: the tool copies each list and
+// releases it at once, and what the library does does not depend on it.
+inline constexpr char kRelease[] = "release";
+
 namespace member {
 
 // A call.
@@ -46,6 +50,7 @@ inline constexpr char kId[] = "id";
 inline constexpr char kSize[] = "size";
 inline constexpr char kValue[] = "value";
 inline constexpr char kResult[] = "result";
+inline constexpr char kList[] = "list";  // the number of the property list that was given, or is released
 
 // When a call was made, as a recording tells it.
 inline constexpr char kAt[] = "atUs";  // microseconds since the recording began
@@ -91,5 +96,8 @@ inline constexpr int kTraceFormat = 1;
 
 // What an open returned that gave a session, in "returned".
 inline constexpr char kHandle[] = "handle";
+
+// The "list" of a release that frees none that a call gave.
+inline constexpr char kUnknownList[] = "unknown";
 
 }  // namespace senseloom::tool

@@ -46,7 +46,7 @@ std::optional<TraceCall> TraceReader::next() {
   while (true) {
     object = nextObject();
     if (object == nullptr) return end();
-    if (!readAboutRecording(object)) break;
+    if (!readAside(object)) break;
   }
 
   if (!isRecording && hasMember(object, member::kAt)) {
@@ -114,10 +114,14 @@ bool TraceReader::readLine() {
   return true;
 }
 
-// Takes what is no call: a note, or what a recording says of itself.
-bool TraceReader::readAboutRecording(const Json& object) {
-  if (hasMember(object, member::kCall)) return false;
-  if (hasMember(object, member::kFormat)) {
+// Takes what is no call for a replay: a release, a note, or what a recording says of itself.
+bool TraceReader::readAside(const Json& object) {
+  if (isRelease(object)) {
+    hasEnd = false;
+    releasedList(object);  // it has to name one
+  } else if (hasMember(object, member::kCall)) {
+    return false;
+  } else if (hasMember(object, member::kFormat)) {
     readHead(object);
   } else if (hasMember(object, member::kEnd)) {
     readEnd(object);

@@ -26,9 +26,9 @@ struct Waiting {
 };
 
 // Reads a trace, JSON Lines with one call a line, a line at a time. Blank lines are skipped, and so are lines with a
-// "note" in place of a call. What a recording says of itself is not a call either: what a reader of it should know, as
-// that something is missing or that the program broke the library's contract, is passed on as remarks. A trace without
-// a call is remarked upon, too.
+// "note" in place of a call and releases of property lists. What a recording says of itself is not a call either: what
+// a reader of it should know, as that something is missing or that the program broke the library's contract, is passed
+// on as remarks. A trace without a call is remarked upon, too.
 class TraceReader {
  public:
   using Remark = std::function<void(const std::string& text)>;
@@ -51,7 +51,8 @@ class TraceReader {
   // The names of the classes from 0 on, if the head or a note so far has them.
   const ClassNames& classNames() const { return names; }
 
-  // Has passed on what is no call: notes, and the head and the end of a recording, each with its line.
+  // Has passed on what is no call for a replay: notes, releases of property lists, and the head and the end of a
+  // recording, each with its line.
   using AsideListener = std::function<void(size_t line, const Json& object)>;
   void listen(AsideListener toAsides) { onAside = std::move(toAsides); }
 
@@ -71,7 +72,7 @@ class TraceReader {
  private:
   Json nextObject();
   bool readLine();
-  bool readAboutRecording(const Json& object);
+  bool readAside(const Json& object);
   void readNote(const Json& note);
   // What a note or a head may say of the records.
   void readAboutRecords(const Json& object);
