@@ -1,5 +1,8 @@
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <string>
+
 #include "run_tool.h"
 
 namespace senseloom::tool {
@@ -52,6 +55,67 @@ TEST(Info, PrintsJson) {
                      R"("duration":"0:01:30.000","sensors":[{"sensor":"STAP","sessions":1,"options":0,"records":2}],)"
                      R"("remarks":[],"leaks":[{"session":"a","sensor":"STAP","line":2}]})"
                      "\n");
+}
+
+// Two lists of s1 are released, one of them twice; of s2, only the list that it gave at the end.
+constexpr char kLists[] = R"({"call":"open","session":"s1","sensor":"STAP"}
+{"call":"open","session":"s2","sensor":"STAP"}
+{"call":"set_option","session":"s1","option":{},"list":1}
+{"call":"set_option","session":"s2","option":{},"list":2}
+{"call":"release","list":1}
+{"call":"set_option","session":"s1","option":{},"list":3}
+{"call":"release","list":3}
+{"call":"release","list":null}
+{"call":"release","list":1}
+{"call":"release","list":"unknown"}
+{"call":"release","list":"unknown"}
+{"call":"release","list":99}
+{"call":"close","session":"s2","list":4}
+{"call":"release","list":4}
+{"call":"close","session":"s1"}
+)";
+
+TEST(Info, TellsListsThatAreNeverReleasedAndThoseReleasedWrongly) {
+  const ToolRun run = runTool({"info", "-"}, kLists);
+  EXPECT_EQ(run.out,
+            "trace: standard input\n"
+            "calls: 2 open, 3 set_option, 2 close\n"
+            "lists: 4 given, 3 released\n"
+            "  sensor  sessions  options  records\n"
+            "  STAP           2        3        0\n"
+            "standard input:9: list 1 is released once more\n"
+            "standard input:10: a list is released that no recorded call gave, the first of 2 such releases\n"
+            "leak: list 2, given to session \"s2\" by set_option on line 4, is never released\n");
+  EXPECT_EQ(run.err, "");
+  EXPECT_EQ(run.status, 0);
+  EXPECT_EQ(runTool({"info", "--json", "-"}, kLists).out,
+            R"({"trace":"standard input","calls":"2 open, 3 set_option, 2 close","lists":"4 given, 3 released",)"
+            R"("sensors":[{"sensor":"STAP","sessions":2,"options":3,"records":0}],)"
+            R"("remarks":["standard input:9: list 1 is released once more","standard input:10: a list is released )"
+            R"(that no recorded call gave, the first of 2 such releases"],"leaks":[],)"
+            R"("listLeaks":[{"list":2,"session":"s2","call":"set_option","line":4}]})"
+            "\n");
+}
+
+TEST(Info, CountsTheListsBeyondTheFirstThatAreNeverReleased) {
+  std::string trace = "{\"call\":\"open\",\"session\":\"a\",\"sensor\":\"STAP\"}\n";
+  for (int list = 1; list <= 7; ++list) {
+    trace += R"({"call":"set_option","session":"a","option":{},"list":)" + std::to_string(list) + "}\n";
+  }
+  const std::string told = runTool({"info", "-"}, trace + "{\"call\":\"close\",\"session\":\"a\"}\n").out;
+  EXPECT_NE(told.find("leak: list 1, given to session \"a\" by set_option on line 2, is never released\n"),
+            std::string::npos);
+  const std::string rest = "on line 6, is never released\nleak: 2 more lists are never released\n";
+  EXPECT_EQ(told.substr(told.size() - std::min(rest.size(), told.size())), rest);
+}
+
+TEST(Info, DoesNotCallATraceLeakyThatDoesNotTellOfReleases) {
+  const ToolRun run = runTool({"info", "-"}, R"({"call":"open","session":"a","sensor":"STAP"}
+{"call":"set_option","session":"a","option":"{}","returned":0,"properties":[]}
+{"call":"close","session":"a"}
+)");
+  EXPECT_EQ(run.out.find("list"), std::string::npos) << run.out;
+  EXPECT_EQ(run.out.find("leak"), std::string::npos) << run.out;
 }
 
 TEST(Info, ReportsBadInput) {

@@ -18,7 +18,7 @@ struct InfoArguments {
 
 void declareInfo(CLI::App& app, Action& action) {
   CLI::App* command = app.add_subcommand(
-      "info", "Print what a trace holds: where it is from, its calls, what is missing or left open.");
+      "info", "Print what a trace holds: where it is from, its calls, what is missing, left open or not released.");
   auto arguments = std::make_shared<InfoArguments>();
   command->add_option("TRACE", arguments->trace, "the trace; - is standard input")->required()->type_name("FILE");
   command->add_flag("--json", arguments->json, "print one JSON object");

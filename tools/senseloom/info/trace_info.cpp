@@ -8,6 +8,7 @@
 #include <utility>
 #include <vector>
 
+#include "info/list_leaks.h"
 #include "input_error.h"
 #include "terminal/text_table.h"
 #include "trace/json.h"
@@ -38,12 +39,13 @@ class TraceInfo {
  public:
   explicit TraceInfo(const std::string& file)
       : reader(file, [this](const std::string& remark) { remarks.push_back(remark); }) {
-    reader.listen([this](size_t, const Json& aside) { takeAside(aside); });
+    reader.listen([this](size_t line, const Json& aside) { takeAside(line, aside); });
     try {
       while (const auto call = reader.next()) take(*call);
     } catch (const InputError& error) {
       throw InputError(reader.position() + ": " + error.what());
     }
+    for (const std::string& wrong : lists.wrongReleases()) remarks.push_back(reader.fileName() + ':' + wrong);
   }
 
   void print(std::FILE* out) const {
@@ -59,6 +61,7 @@ class TraceInfo {
       std::fprintf(out, "leak: session \"%s\" on %s, opened on line %zu, is never closed\n", name.c_str(),
                    session.sensor->name, session.line);
     }
+    for (const std::string& leak : lists.texts()) std::fprintf(out, "leak: %s\n", leak.c_str());
   }
 
   void printJson(std::FILE* out) const {
@@ -80,14 +83,17 @@ class TraceInfo {
                                                    session.sensor->name, "line", number(session.line)));
     }
     addMember(object, "leaks", std::move(leaks));
+    if (Json listLeaks = lists.json()) addMember(object, "listLeaks", std::move(listLeaks));
     std::fprintf(out, "%s\n", compactText(object.get()).c_str());
   }
 
  private:
   static json_int_t number(size_t count) { return static_cast<json_int_t>(count); }
 
-  void takeAside(const Json& aside) {
-    if (isNote(aside)) {
+  void takeAside(size_t line, const Json& aside) {
+    if (isRelease(aside)) {
+      lists.takeRelease(line, aside);
+    } else if (isNote(aside)) {
       ++notes;
     } else if (json_object_get(aside.get(), member::kFormat) != nullptr) {
       head.reset(json_incref(aside.get()));
@@ -96,6 +102,7 @@ class TraceInfo {
 
   void take(const TraceCall& call) {
     ++calls[static_cast<size_t>(call.kind)];
+    lists.take(call);
     if (call.kind == CallKind::open) takeOpen(call);
     const Sensor* sensor = call.sensor;
     if (sensor == nullptr && call.kind != CallKind::uninit) {
@@ -139,6 +146,7 @@ class TraceInfo {
       if (count > 0) text += (text.empty() ? "" : ", ") + std::to_string(count) + ' ' + callName(kind);
     }
     list.emplace_back("calls", text.empty() ? "none" : text);
+    if (const std::string counts = lists.counts(); !counts.empty()) list.emplace_back("lists", counts);
     if (notes > 0) list.emplace_back("notes", std::to_string(notes));
     if (firstTimestamp) {
       list.emplace_back("timestamps", std::to_string(*firstTimestamp) + " to " + std::to_string(*lastTimestamp));
@@ -161,6 +169,7 @@ class TraceInfo {
   size_t notes = 0;
   std::map<const Sensor*, SensorCounts> sensors;  // in the order of the tool's table
   std::map<std::string, OpenSession> open;
+  ListLeaks lists;
   std::optional<uint64_t> firstTimestamp;
   std::optional<uint64_t> lastTimestamp;
   std::optional<int64_t> lastMicroseconds;
