@@ -65,6 +65,27 @@ TEST(Trim, CutsByTimeAndLineAndMarksSessionsThatWereOpenBefore) {
   expectPart(trimmed({"--from", "6", "--to", "8"}));
 }
 
+// Also behind the part, so that a list of it does not look like one that is never released.
+TEST(Trim, KeepsTheReleasesOfListsThatKeptCallsGave) {
+  const std::string open = R"({"call":"open","session":"a","sensor":"LIFT"})"
+                           "\n";
+  const std::string other = R"({"call":"open","session":"b","sensor":"STAP"})"
+                            "\n";
+  const auto set = [](const std::string& session, int list) {
+    return R"({"call":"set_option","session":")" + session + R"(","option":{},"list":)" + std::to_string(list) + "}\n";
+  };
+  const auto release = [](const std::string& list) { return R"({"call":"release","list":)" + list + "}\n"; };
+  const std::string trace = open + other + set("a", 1) + release("1") + set("b", 2) + release("2") + set("a", 3) +
+                            release("null") + set("a", 4) + release("3") + release("4") + release("\"unknown\"");
+  const auto part = [&](std::vector<std::string> arguments) {
+    arguments.insert(arguments.begin(), {"trim", "-"});
+    return runTool(arguments, trace).out;
+  };
+  EXPECT_EQ(part({"--sensor", "LIFT", "--to", "8"}),
+            open + set("a", 1) + release("1") + set("a", 3) + release("null") + release("3") + release("\"unknown\""));
+  EXPECT_EQ(part({"--sensor", "STAP"}), other + set("b", 2) + release("2") + release("null") + release("\"unknown\""));
+}
+
 TEST(Trim, MakesAPartThatReplaysAsRecorded) {
   const ScratchFile recording("recording");
   ASSERT_EQ(recordTo(recording.name, {TOOL_FILE, "replay", "--quiet", "commute.jsonl"}).status, 0);

@@ -6,6 +6,7 @@
 #include <memory>
 #include <optional>
 #include <string_view>
+#include <unordered_set>
 #include <utility>
 #include <vector>
 
@@ -73,8 +74,15 @@ class Trimmer {
  private:
   void takeAside(const Json& aside) {
     if (json_object_get(aside.get(), member::kEnd) != nullptr) return;  // it has an end of its own
+    if (isRelease(aside) && !isOfKeptList(aside)) return;
     if (json_object_get(aside.get(), member::kFormat) != nullptr) isRecording = true;
     write(reader.line());
+  }
+
+  // NULL and what no call gave are nobody's.
+  bool isOfKeptList(const Json& release) const {
+    const int64_t list = releasedList(release).value_or(0);
+    return list == 0 || keptLists.contains(list);
   }
 
   void take(const TraceCall& call) {
@@ -91,6 +99,7 @@ class Trimmer {
     if (call.engine) engine = {recordField<uint64_t>(record, kTimestampOffset), engineOfLine()};
     if (call.kind == CallKind::dispatch && !isWanted) return;
     if (call.kind == CallKind::dispatch && sensor->items == Items::samples) return writeGesture(call, record);
+    if (call.list != 0) keptLists.insert(call.list);
     const bool isResumed =
         call.kind == CallKind::open && isBefore && call.recorded != nullptr && filter.takes(call.session, sensor);
     writeCall(isResumed ? changed([](const Json& line) { addMember(line, member::kResumed, Json(json_integer(1))); })
@@ -181,6 +190,7 @@ class Trimmer {
   CallFilter filter;
   std::vector<std::string> sensors;  // concerned; empty: all
   std::optional<NewFile> target;
+  std::unordered_set<int64_t> keptLists;        // by their numbers
   std::map<std::string, const Sensor*> opened;  // sessions by name, as opened last
   std::vector<Carried> carried;
   struct {
