@@ -65,6 +65,21 @@ std::string breachLine(const Breach& breach, int64_t at) {
   return std::string(line.finish());
 }
 
+std::string releaseLine(const void* list, int64_t number, int64_t at, int thread) {
+  TraceLine line;
+  line.addText(member::kCall, tool::kRelease);
+  if (list == nullptr) {
+    line.addNull(member::kList);
+  } else if (number == 0) {
+    line.addText(member::kList, tool::kUnknownList);
+  } else {
+    line.addInteger(member::kList, number);
+  }
+  line.addInteger(member::kAt, at / kMicrosecond);
+  line.addInteger(member::kThread, thread);
+  return std::string(line.finish());
+}
+
 std::string listNote(const std::string& sensor, const ctx_option_t& list) {
   TraceLine line;
   line.addText(member::kNote, "the properties in force");

@@ -24,6 +24,8 @@ struct CallTime {
 // The head of a part; `startedAt` is the wall-clock time when the recording began, in nanoseconds since 1970.
 std::string headLine(uint32_t part, int64_t startedAt);
 std::string breachLine(const Breach& breach, int64_t at);
+// `number` is that of the list; 0: NULL, or one that no call gave.
+std::string releaseLine(const void* list, int64_t number, int64_t at, int thread);
 // For readers: what list a sensor has.
 std::string listNote(const std::string& sensor, const ctx_option_t& list);
 

@@ -58,23 +58,26 @@ std::optional<Breach> ContractWatch::usedClosed(const void* handle, const char* 
                    .threads = {closing.thread, thread}});
 }
 
-void ContractWatch::listGiven(const void* list) {
+int64_t ContractWatch::listGiven(const void* list) {
   for (Released& one : released) {
     if (one.list == list) one = {};
   }
+  return lists[list] = ++lastList;
 }
 
-std::optional<Breach> ContractWatch::listReleased(const void* list, int thread) {
-  if (list == nullptr) return std::nullopt;
+ListRelease ContractWatch::listReleased(const void* list, int thread) {
+  if (list == nullptr) return {};
   const auto* first = std::find_if(released.begin(), released.end(), [=](auto& one) { return one.list == list; });
   if (first == released.end()) {
-    released[nextReleased++ % released.size()] = {list, thread};
-    return std::nullopt;
+    const auto given = lists.extract(list);
+    const int64_t number = given.empty() ? 0 : given.mapped();
+    released[nextReleased++ % released.size()] = {list, number, thread};
+    return {number};
   }
-  return onlyOnce(
-      {.kind = "list released twice",
-       .text = "a property list is released twice: first" + inThread(first->thread) + ", again" + inThread(thread),
-       .threads = {first->thread, thread}});
+  return {first->number, onlyOnce({.kind = "list released twice",
+                                   .text = "a property list is released twice: first" + inThread(first->thread) +
+                                           ", again" + inThread(thread),
+                                   .threads = {first->thread, thread}})};
 }
 
 void ContractWatch::resultGiven(uint32_t session, const void* result, int size, const void* record, int thread) {

@@ -187,9 +187,7 @@ int Recorder::close(void* handle, ctx_option_t** out) noexcept {
 }
 
 int32_t Recorder::release(ctx_option_t* list) noexcept {
-  if (isRecording) {
-    step([=, this] { note(watch.listReleased(list, currentThread())); });
-  }
+  step([=, this] { released(list); });
   return library().optionRelease(list);
 }
 
@@ -249,7 +247,7 @@ void Recorder::prepare() {
 // The child has the sessions of its parent. Their recording goes on in a file of its own, if it is to.
 void Recorder::prepareChild() {
   isInChild = false;
-  watch = {};
+  watch.inChild();
   for (auto& [handle, session] : sessions) session.counts = control.countsFor(session.number);
   const bool goesOn = isRecording && order.followForks;
   isRecording = false;
@@ -363,12 +361,23 @@ void Recorder::addEngineAnswers(Call& call) {
 }
 
 void Recorder::negotiated(Call& call, int returned, ctx_option_t** out) {
-  if (!call.isAlone) return;
-  call.line.addReturned(returned);
-  if (!call.hasResult || *out == nullptr) return;
-  addProperties(call.line, **out);
-  watch.listGiven(*out);
-  inForce.listed(call.session.number, listNote(inForce.sensorOf(call.session.number), **out));
+  const bool hasList = call.hasResult && *out != nullptr;
+  const int64_t list = hasList ? watch.listGiven(*out) : 0;
+  if (call.isAlone) call.line.addReturned(returned);
+  if (call.isAlone && hasList) {
+    addProperties(call.line, **out);
+    inForce.listed(call.session.number, listNote(inForce.sensorOf(call.session.number), **out));
+  }
+  if (hasList) call.line.addInteger(member::kList, list);
+}
+
+// Before the release is made, which may be what ends the program.
+void Recorder::released(const ctx_option_t* list) {
+  const int thread = currentThread();
+  const ListRelease release = watch.listReleased(list, thread);
+  if (!isRecording || isInChild) return;  // a child is recorded from its next call on
+  note(release.breach);
+  writer->write(releaseLine(list, release.list, sinceStart(), thread), LineKind::note);
 }
 
 void Recorder::tellState(std::string_view line) {

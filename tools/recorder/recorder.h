@@ -99,6 +99,7 @@ class Recorder {
   void finish(Call& call);
   void addEngineAnswers(Call& call);
   void negotiated(Call& call, int returned, ctx_option_t** out);
+  void released(const ctx_option_t* list);
   void tellState(std::string_view line);
   void tellStateAnew();
 

@@ -16,7 +16,7 @@ namespace senseloom::trace {
 enum class LineKind {
   call,
   repeated,  // a call that was made before this part
-  note,
+  note,      // or a release: what does not count as a call
   head,
 };
 

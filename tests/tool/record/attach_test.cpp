@@ -125,6 +125,21 @@ TEST(Attach, ObeysOrdersThatAShellWrites) {
   EXPECT_EQ(check(trace.name).out, "2 calls compared, all as recorded; 1 without a recorded result\n");
 }
 
+TEST(Attach, KnowsTheListsThatWereGivenBefore) {
+  const ScratchFile trace("attached_lists");
+  BackgroundProgram program({DRIVEN_FILE}, notRecording());
+  for (const char* line : {"open a LIFT", "keep a {}", "keep a {}", "drop 1"}) program.ask(line);
+  std::fstream(memoryOf(program), std::ios::in | std::ios::out) << "record " << trace.name << '\n' << std::flush;
+  for (const char* line : {"keep a {}", "drop 2", "close a"}) program.ask(line);
+  program.finish();
+  const std::string content = contentOf(trace.name);
+  EXPECT_NE(content.find(R"(,"list":3,)"), std::string::npos) << content;
+  EXPECT_NE(content.find(R"({"call":"release","list":2,)"), std::string::npos) << content;
+  const std::string told = runTool({"info", trace.name}).out;
+  EXPECT_NE(told.find("lists: 1 given, 0 released\n"), std::string::npos) << told;
+  EXPECT_EQ(told.find("no recorded call gave"), std::string::npos) << told;
+}
+
 TEST(Status, PrintsWhatIsInForce) {
   BackgroundProgram program({DRIVEN_FILE}, notRecording());
   for (const char* line : {"open a STAP", "open b STAP", "set a {\"classMask\":1}", "set b {\"level\":-2}", "set b [",

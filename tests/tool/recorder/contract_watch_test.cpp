@@ -53,12 +53,36 @@ TEST(ContractWatchTest, ForgetsAClosedHandleThatIsOpenedAgain) {
 TEST(ContractWatchTest, KnowsAListThatIsHandedOutAgain) {
   ContractWatch watch;
   int list;
-  EXPECT_FALSE(watch.listReleased(nullptr, 1));
-  EXPECT_FALSE(watch.listReleased(nullptr, 1));
-  EXPECT_FALSE(watch.listReleased(&list, 1));
+  EXPECT_FALSE(watch.listReleased(nullptr, 1).breach);
+  EXPECT_FALSE(watch.listReleased(nullptr, 1).breach);
+  EXPECT_FALSE(watch.listReleased(&list, 1).breach);
   watch.listGiven(&list);
-  EXPECT_FALSE(watch.listReleased(&list, 1));
-  EXPECT_TRUE(watch.listReleased(&list, 2));
+  EXPECT_FALSE(watch.listReleased(&list, 1).breach);
+  EXPECT_TRUE(watch.listReleased(&list, 2).breach);
+}
+
+TEST(ContractWatchTest, KnowsTheNumberOfAListUntilItIsReleased) {
+  ContractWatch watch;
+  int lists[70];
+  for (int i = 0; i < 70; ++i) EXPECT_EQ(watch.listGiven(&lists[i]), i + 1);
+  for (int i = 70; i-- > 0;) EXPECT_EQ(watch.listReleased(&lists[i], 1).list, i + 1);
+  EXPECT_EQ(watch.listReleased(&lists[0], 1).list, 1) << "released twice";
+  EXPECT_EQ(watch.listReleased(nullptr, 1).list, 0);
+  int unknown;
+  EXPECT_EQ(watch.listReleased(&unknown, 1).list, 0);
+  EXPECT_EQ(watch.listGiven(&lists[0]), 71) << "the memory is another list's";
+  EXPECT_EQ(watch.listReleased(&lists[0], 1).list, 71);
+}
+
+// What the process was given it can still release.
+TEST(ContractWatchTest, KnowsInAChildProcessWhatTheParentWasGiven) {
+  ContractWatch watch;
+  int list;
+  watch.listGiven(&list);
+  watch.entered(1, "set_option");
+  watch.inChild();
+  EXPECT_FALSE(watch.entered(2, "dispatch")) << "of the threads only the one that forked is left";
+  EXPECT_EQ(watch.listReleased(&list, 2).list, 1);
 }
 
 TEST(ContractWatchTest, KnowsWhoseMemoryARecordIsIn) {

@@ -19,6 +19,9 @@ import jsonschema
 SCRIPT = """open a PHYAC
 set a {"logN":2}
 set a {"logN":1}
+keep a {"logN":1}
+drop 0
+drop 9
 repeat a 9
 dispatch missing 1
 open b PHYAC
@@ -28,9 +31,9 @@ race b {"logN":2}
 open c STAP
 set c {"level":99}
 open d NONE
-close b
 repeat a 21
 repeat c 20
+close b
 stale a c
 close c
 dispatch c 3

@@ -69,7 +69,8 @@ ToolRun check(const std::string& file) {
 }
 
 std::string callsOf(const std::string& recording) {
-  static const std::regex kAbout(R"re((\{"(format|end)":[^\n]*\n)|(\{"note":[^\n]*,"breach":[^\n]*\n))re");
+  static const std::regex kAbout(
+      R"re((\{"(format|end|call":"release)":?[^\n]*\n)|(\{"note":[^\n]*,"breach":[^\n]*\n))re");
   static const std::regex kTime(R"re(,"atUs":\d+,"thread":\d+,"tookNs":\d+)re");
   return std::regex_replace(std::regex_replace(recording, kAbout, ""), kTime, "");
 }

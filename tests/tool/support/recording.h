@@ -46,8 +46,8 @@ ToolRun recordDriven(const std::string& file, const std::string& lines, std::vec
 // Runs `senseloom replay --check FILE`, where the gesture engine itself recognises nothing.
 ToolRun check(const std::string& file);
 
-// A recording without what is different each time: its head and its end, notes about its threads, and the times and
-// threads of its calls.
+// The calls of a recording, with its notes but without the releases of property lists, and without what is different
+// each time: its head and its end, notes about its threads, and the times and threads of its calls.
 std::string callsOf(const std::string& recording);
 
 // What `record` says of a recording at its end.

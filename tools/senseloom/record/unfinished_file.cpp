@@ -13,6 +13,7 @@ namespace senseloom::tool {
 namespace {
 
 constexpr size_t kReadAtOnce = 1 << 16;
+constexpr std::string_view kReleaseStart = R"({"call":"release")";  // it is not counted
 
 bool beginsWithMember(std::string_view line, std::string_view name) {
   return line.substr(0, 2) == "{\"" && line.substr(2, name.size()) == name && line[2 + name.size()] == '"';
@@ -49,6 +50,7 @@ Lines linesOf(int file) {
 
 LineOfRecording kindOf(std::string_view line) {
   if (beginsWithMember(line, member::kFormat)) return LineOfRecording::head;
+  if (line.starts_with(kReleaseStart)) return LineOfRecording::other;
   if (beginsWithMember(line, member::kCall)) return LineOfRecording::call;
   if (beginsWithMember(line, member::kEnd)) return LineOfRecording::end;
   return LineOfRecording::other;

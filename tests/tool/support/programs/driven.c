@@ -5,6 +5,8 @@
  *   dispatch NAME N       a record of one decision, with timestamp N and class N modulo 8
  *   repeat NAME N         N such records
  *   release NAME OPTION   sets an option, and releases the list twice
+ *   keep NAME OPTION      sets an option, and keeps the list
+ *   drop N                releases the Nth list that was kept; 0: NULL; one more than there are: a list of its own
  *   stale NAME OTHER      gives one session a result of another, which has had a record since
  *   race NAME OPTION      sets an option, and gives the session a record in another thread meanwhile
  *   fork                  goes on in a child process until the end of the input; the parent waits for it
@@ -61,6 +63,19 @@ static int set(void* handle, const char* option, int releases) {
   const int returned = ctx_set_option(handle, 0, option, &list);
   while (releases-- > 0) ctx_option_release(list);
   return returned;
+}
+
+/* What is reachable is no leak for a sanitizer. */
+static ctx_option_t* kept[64] = {NULL};
+static int kept_count;
+
+static int keep(void* handle, const char* option) {
+  return ctx_set_option(handle, 0, option, &kept[++kept_count]);
+}
+
+static int drop(int number) {
+  if (number > kept_count) kept[number] = calloc(1, sizeof **kept);
+  return ctx_option_release(kept[number]);
 }
 
 static int close_session(void* handle) {
@@ -137,6 +152,8 @@ static int do_line(const char* verb, const char* name, const char* rest) {
     return number;
   }
   if (strcmp(verb, "release") == 0) return set(*handle, rest, 2);
+  if (strcmp(verb, "keep") == 0) return keep(*handle, rest);
+  if (strcmp(verb, "drop") == 0) return drop(atoi(name));
   if (strcmp(verb, "stale") == 0) return use_stale_result(*handle, *handle_of(rest));
   if (strcmp(verb, "race") == 0) return set_and_race(*handle, rest);
   if (strcmp(verb, "fork") == 0) return fork_here();
