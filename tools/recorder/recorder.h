@@ -30,7 +30,8 @@ namespace senseloom::trace {
 // Makes the calls of the program and, while recording, writes them to a trace, one line each, when they have returned.
 // Each call is recorded in two steps: its arguments before it is made, since they may be in memory that it changes, and
 // then what it returned. Nothing is locked while the library runs, but for a moment when the gesture engine has
-// answered.
+// answered. The release of a property list is recorded in one step, before it is made: from then on the memory of the
+// list may be another one's.
 //
 // Sessions are named s1, s2 and so on, in the order of the calls that opened them. What a trace cannot express (an
 // argument that is NULL, a handle that is not open, a sensor that does not exist) is written as a note, for readers
