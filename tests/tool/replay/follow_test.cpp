@@ -11,6 +11,7 @@ namespace senseloom::tool {
 namespace {
 
 constexpr char kOpenLine[] = R"({"call":"open","session":"a","sensor":"LIFT"})";
+constexpr char kSetOption[] = R"({"call":"set_option","session":"a","option":{}})";
 constexpr char kDispatch[] = R"({"call":"dispatch","session":"a","record":{"timestamp":1,"class":1}})";
 
 // Whether a line of a table has these cells, whatever the blanks between them.
@@ -49,6 +50,37 @@ TEST(FollowingCommand, IsNotNeededForAPipe) {
     EXPECT_NE(explain.ask(kDispatch).find("a on LIFT"), std::string::npos);
     EXPECT_EQ(explain.finish().status, 0);
   }
+}
+
+// Runs a line of the shell that uses $OPEN, $SET and $DISPATCH, lines of a trace, and $TOOL.
+ToolRun runShell(const std::string& line, const Environment& more = {}) {
+  Environment environment{{"OPEN", kOpenLine}, {"SET", kSetOption}, {"DISPATCH", kDispatch}, {"TOOL", TOOL_FILE}};
+  environment.insert(environment.end(), more.begin(), more.end());
+  return BackgroundProgram({"/bin/sh", "-c", line}, environment).finish();
+}
+
+constexpr char kFirstLine[] = "line 2: a on LIFT sets {}\n";
+
+// The status is that of a program that SIGPIPE ended. A trace without an end stands for a long one.
+TEST(OutputCutShort, IsThereAtOnceAndEndsTheCommandHoweverLongTheTraceIs) {
+  const ToolRun run = runShell(
+      "{ printf '%s\\n' \"$OPEN\" \"$SET\"; timeout 60 yes \"$DISPATCH\"; } | "
+      "{ \"$TOOL\" explain -; echo $? >&2; } | head -n 1");
+  EXPECT_EQ(run.out, kFirstLine);
+  EXPECT_EQ(run.err, "141\n");
+}
+
+// The rest of the trace comes when the reader of the output has gone.
+TEST(OutputCutShort, LeavesAPictureWhole) {
+  const ScratchFolder folder("picture_of_a_pipe");
+  const ToolRun run = runShell(
+      "mkfifo \"$GONE\"; "
+      "{ printf '%s\\n' \"$OPEN\" \"$SET\"; read -r _ <\"$GONE\"; yes \"$DISPATCH\" | head -n 3000; } | "
+      "\"$TOOL\" explain --plot \"$PICTURE\" - | "
+      "{ IFS= read -r line; echo \"$line\" >&2; exec <&-; echo >\"$GONE\"; }",
+      {{"GONE", folder.file("gone")}, {"PICTURE", folder.file("picture.svg")}});
+  EXPECT_EQ(run.err, kFirstLine);
+  EXPECT_NE(contentOf(folder.file("picture.svg")).find("</svg>"), std::string::npos);
 }
 
 TEST(FollowingCommand, RefusesWhatIsCompressed) {

@@ -14,6 +14,7 @@
 #include "plot/replay_plot.h"
 #include "replay/replay_progress.h"
 #include "terminal/interrupt.h"
+#include "terminal/shown_output.h"
 #include "trace/json.h"
 #include "trace/replayer.h"
 #include "trace/trace_reader.h"
@@ -29,8 +30,8 @@ void requireObject(const std::string& session, const std::string& option) {
 }
 
 // A mistyped sensor looks like the name of a file.
-TraceReader openTrace(const std::string& file, const Waiting& waiting) try {
-  return TraceReader(file, TraceReader::printOnStandardError, waiting);
+TraceReader openTrace(const std::string& file, const Reading& reading) try {
+  return TraceReader(file, TraceReader::printOnStandardError, reading);
 } catch (const InputError& error) {
   const std::string nearest = nearestSensor(file);
   const bool isMistyped = model::editDistance(file, nearest) <= 2;
@@ -72,7 +73,8 @@ void explainOptions(std::FILE* out, const std::string& sensor, const std::vector
 
 void explainTrace(std::FILE* out, const std::string& file, const ExplanationForm& form, const PlotArguments& plot) {
   const InterruptMark mark;
-  TraceReader trace = openTrace(file, {.follows = form.follows, .meanwhile = [out] { std::fflush(out); }});
+  const auto show = [out, hasPicture = !plot.file.empty()] { showSoFar(out, hasPicture); };
+  TraceReader trace = openTrace(file, {.follows = form.follows, .meanwhile = show});
   LogCapture log;
   const auto output = withFilter(makeOutput(out, form), form.filter, trace);
   auto explainer = std::make_unique<Explainer>(*output, log);

@@ -20,6 +20,7 @@
 #include "replay/summary_output.h"
 #include "replay/table_output.h"
 #include "terminal/interrupt.h"
+#include "terminal/shown_output.h"
 #include "trace/replayer.h"
 #include "trace/time_unit.h"
 #include "trace/trace_reader.h"
@@ -80,8 +81,9 @@ std::unique_ptr<ReplayObserver> makeOutput(std::FILE* out, const ReplayArguments
 
 void replay(std::FILE* out, const ReplayArguments& arguments) {
   const InterruptMark mark;
+  const auto show = [out, hasPicture = !arguments.plot.file.empty()] { showSoFar(out, hasPicture); };
   TraceReader trace(arguments.file, TraceReader::printOnStandardError,
-                    {.follows = arguments.follows, .meanwhile = [out] { std::fflush(out); }});
+                    {.follows = arguments.follows, .meanwhile = show});
   __android_log_set_minimum_priority(kLogLevels.at(arguments.log));
   const bool isFilling = !arguments.quiet && !arguments.check;
   auto shown = withFilter(withPlot(makeOutput(out, arguments, trace), trace, arguments.plot), arguments.filter, trace);

@@ -1,7 +1,6 @@
 #include "trace/byte_stream.h"
 
 #include <fcntl.h>
-#include <poll.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -21,7 +20,7 @@ namespace {
 // A file as it is, with a look ahead at its first bytes.
 class PlainBytes final : public ByteStream {
  public:
-  PlainBytes(int file, BeforeWait toCall) : descriptor(file), beforeWait(std::move(toCall)) {
+  explicit PlainBytes(int file) : descriptor(file) {
     while (start.size() < kZstdMark.size()) {
       char bytes[4];
       const size_t count = readFile(bytes, kZstdMark.size() - start.size());
@@ -50,8 +49,6 @@ class PlainBytes final : public ByteStream {
 
  private:
   size_t readFile(char* bytes, size_t room) const {
-    pollfd input{.fd = descriptor, .events = POLLIN, .revents = 0};
-    if (beforeWait && poll(&input, 1, 0) == 0) beforeWait();
     ssize_t count;
     do {
       if (isInterrupted()) return 0;
@@ -62,16 +59,15 @@ class PlainBytes final : public ByteStream {
   }
 
   const int descriptor;
-  const BeforeWait beforeWait;
   std::string start;
 };
 
 }  // namespace
 
-std::unique_ptr<ByteStream> openBytes(const std::string& file, BeforeWait beforeWait) {
+std::unique_ptr<ByteStream> openBytes(const std::string& file) {
   const int descriptor = file == "-" ? dup(STDIN_FILENO) : open(file.c_str(), O_RDONLY | O_CLOEXEC);
   if (descriptor < 0) throw InputError(std::strerror(errno));
-  auto plain = std::make_unique<PlainBytes>(descriptor, std::move(beforeWait));
+  auto plain = std::make_unique<PlainBytes>(descriptor);
   if (plain->beginsWith(kGzipMark)) return gunzipped(std::move(plain));
   if (plain->beginsWith(kZstdMark)) return unzstded(std::move(plain));
   return plain;

@@ -1,7 +1,6 @@
 #pragma once
 
 #include <cstddef>
-#include <functional>
 #include <memory>
 #include <string>
 
@@ -20,12 +19,8 @@ class ByteStream {
   virtual size_t size() const { return 0; }
 };
 
-// Called when all that is there so far was read, before a wait for more. Returns whether to wait.
-using BeforeWait = std::function<bool()>;
-
 // Opens a file; "-" is standard input. What is compressed by gzip or zstd, as its first bytes tell, is given as it was
-// before. Nothing but pipes and devices is waited for, and those until their end, whatever `beforeWait` returns, which
-// may be null. Throws InputError.
-std::unique_ptr<ByteStream> openBytes(const std::string& file, BeforeWait beforeWait = nullptr);
+// before. Nothing but pipes and devices is waited for, and those until their end. Throws InputError.
+std::unique_ptr<ByteStream> openBytes(const std::string& file);
 
 }  // namespace senseloom::tool

@@ -18,7 +18,7 @@ constexpr size_t kChunk = 1 << 16;
 
 std::unique_ptr<ByteStream> open(const std::string& file, const std::string& name, bool follows,
                                  const BeforeWait& beforeWait) try {
-  return follows ? followBytes(file, beforeWait) : openBytes(file, beforeWait);
+  return follows ? followBytes(file, beforeWait) : openBytes(file);
 } catch (const InputError& error) {
   throw InputError(name + ": " + error.what());
 }
@@ -33,9 +33,10 @@ bool hasMember(const Json& object, const char* key) {
 
 }  // namespace
 
-TraceReader::TraceReader(const std::string& file, Remark toRemark, Waiting whileWaiting)
+TraceReader::TraceReader(const std::string& file, Remark toRemark, Reading reading)
     : name(file == "-" ? "standard input" : file), remark(std::move(toRemark)) {
-  stream = open(file, name, whileWaiting.follows, [this, meanwhile = std::move(whileWaiting.meanwhile)] {
+  if (!reading.follows) beforeRead = reading.meanwhile;
+  stream = open(file, name, reading.follows, [this, meanwhile = std::move(reading.meanwhile)] {
     if (meanwhile) meanwhile();
     return !hasEnd;
   });
@@ -98,6 +99,7 @@ bool TraceReader::readLine() {
     buffer.resize(searched + kChunk);
     size_t count = 0;
     try {
+      if (beforeRead) beforeRead();
       count = stream->read(buffer.data() + searched, kChunk);
     } catch (...) {
       buffer.resize(searched);

@@ -16,12 +16,12 @@
 
 namespace senseloom::tool {
 
-// How a trace is read that is not there as a whole yet.
-struct Waiting {
+// How a trace is read.
+struct Reading {
   // Of a file the end is waited for, too: until the recording has its end, or the user interrupts it.
   bool follows = false;
-  // Called when all that is there so far was read, while more is waited for: at least ten times a second if it follows,
-  // otherwise once a wait. May be null.
+  // Called before each read of some hundred lines, so before every wait, too; if it follows, only while it waits, at
+  // least ten times a second. May be null.
   std::function<void()> meanwhile = nullptr;
 };
 
@@ -36,7 +36,7 @@ class TraceReader {
   static void printOnStandardError(const std::string& text);
 
   // "-" is standard input. Throws InputError when the file cannot be opened.
-  explicit TraceReader(const std::string& file, Remark remark = printOnStandardError, Waiting whileWaiting = {});
+  explicit TraceReader(const std::string& file, Remark remark = printOnStandardError, Reading reading = {});
   TraceReader(const TraceReader&) = delete;
   TraceReader& operator=(const TraceReader&) = delete;
 
@@ -82,9 +82,10 @@ class TraceReader {
 
   std::string name;
   Remark remark;
-  std::string buffer;     // what was read
-  size_t lineStart = 0;   // in it
-  size_t lineLength = 0;  // bytes, with the line feed
+  std::function<void()> beforeRead;  // may be null
+  std::string buffer;                // what was read
+  size_t lineStart = 0;              // in it
+  size_t lineLength = 0;             // bytes, with the line feed
   bool isLineWhole = true;
   size_t lineNumber = 0;
   uint64_t byteCount = 0;
