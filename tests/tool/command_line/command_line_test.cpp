@@ -132,6 +132,19 @@ TEST(CommandLine, HelpSaysHowOptionsGoTogether) {
       << replay;
 }
 
+TEST(CommandLine, ChoosesCallsWithTheSameWordsInEveryCommand) {
+  const std::string replay = runTool({"replay", "--help"}).out;
+  const size_t start = replay.find("  --time-unit UNIT");
+  const std::string words = replay.substr(start, replay.find("  --follow") - start);
+  for (const char* option :
+       {"--session NAME", "--sensor SENSOR", "--from LINE or TIME", "--to LINE or TIME", "--failed"}) {
+    EXPECT_NE(words.find(option), std::string::npos) << words;
+  }
+  for (const char* command : {"explain", "view", "watch", "info", "diff", "trim"}) {
+    EXPECT_NE(runTool({command, "--help"}).out.find(words), std::string::npos) << command;
+  }
+}
+
 TEST(CommandLine, ReportsOutputThatCannotBeWrittenWithStatus1) {
   EXPECT_EQ(std::system("exec 2>/dev/null >/dev/full; '" TOOL_FILE "' sensors"), 1 << 8);
   EXPECT_EQ(std::system("exec 2>/dev/null >&-; '" TOOL_FILE "' sensors"), 1 << 8);

@@ -87,6 +87,29 @@ TEST(Diff, ComparesTheSessionsThatAreWanted) {
   EXPECT_EQ(diff(kLeft, kRight, {"--session", "b"}).out, "R:6: dispatch of session \"b\" is only there\n");
 }
 
+TEST(Diff, ComparesTheCallsThatAreWanted) {
+  EXPECT_EQ(diff(kLeft, kRight, {"--sensor", "GSFLK"}).out, "R:6: dispatch of session \"b\" is only there\n");
+  EXPECT_EQ(diff(kLeft, kRight, {"--to", "2"}).out, "2 calls compared, all alike\n");
+  EXPECT_EQ(diff(kLeft, kRight, {"--time-unit", "ms", "--from", "7ms"}).out,
+            "R:7: close of session \"a\" is only there\n"
+            "R:6: dispatch of session \"b\" is only there\n");
+}
+
+TEST(Diff, ComparesTheCallsThatFailed) {
+  const std::string open = R"({"call":"open","session":"a","sensor":"STAP","returned":"handle"})";
+  const std::string wrong = R"({"call":"set_option","session":"a","option":"{","returned":-1})";
+  const std::string otherWrong = R"({"call":"set_option","session":"a","option":"[","returned":-1})";
+  const std::string right = R"({"call":"set_option","session":"a","option":"{}","returned":0})";
+  EXPECT_EQ(diff(open + '\n' + wrong, open + '\n' + right + '\n' + otherWrong, {"--failed"}).out,
+            "L:2 and R:3: set_option of session \"a\" differs\n"
+            "  what    left  right\n"
+            "  option  {     [\n"
+            "  the first difference of this session: what follows may come of it\n");
+  EXPECT_EQ(diff(kLeft, R"({"call":"uninit"})", {"--failed"}).err,
+            "senseloom: R: --failed takes a recording: this trace does not tell what its calls returned, but "
+            "\"senseloom replay --failed\" does\n");
+}
+
 TEST(Diff, PrintsNoMoreThanIsWanted) {
   const ToolRun run = diff(kLeft, kRight, {"--limit", "1"});
   EXPECT_NE(run.out.find("may come of it\n2 more calls differ\n"), std::string::npos) << run.out;

@@ -45,12 +45,71 @@ TEST(Info, TellsWhatATraceHoldsAndWhatIsLeftOpen) {
   EXPECT_EQ(run.status, 0);
 }
 
-TEST(Info, PrintsJson) {
-  const ToolRun run = runTool({"info", "--json", "-"}, R"({"note":"x","timeUnit":"s"}
+// What is told of the calls that are wanted: behind "part", and without the remark.
+std::string toldOf(std::vector<std::string> filter) {
+  filter.insert(filter.begin(), {"info", "-"});
+  const ToolRun run = runTool(filter, kTrace);
+  EXPECT_EQ(run.status, 0) << run.err;
+  std::string told = run.out.substr(run.out.find("calls: "));
+  const std::string remark = "standard input:10: 3 lines could not be recorded: No space left on device\n";
+  EXPECT_NE(told.find(remark), std::string::npos);
+  return told.erase(told.find(remark), remark.size());
+}
+
+constexpr char kLeak[] = "leak: session \"s2\" on LIFT, opened on line 3, is never closed\n";
+
+TEST(Info, TellsOfTheCallsThatAreWanted) {
+  const std::string ofTapping =
+      "calls: 1 open, 1 set_option, 1 dispatch, 1 close\n"
+      "timestamps: 5 to 5\n"
+      "duration: 1:02:03.003\n"
+      "  sensor  sessions  options  records\n"
+      "  STAP           1        1        1\n";
+  EXPECT_EQ(toldOf({"--sensor", "STAP"}), ofTapping);
+  EXPECT_EQ(toldOf({"--session", "s1"}), ofTapping);
+  EXPECT_EQ(toldOf({"--from", "7", "--to", "3600s"}),
+            "calls: 1 dispatch\n"
+            "timestamps: 5 to 5\n"
+            "duration: 0:00:00.000\n"
+            "  sensor  sessions  options  records\n"
+            "  STAP           1        0        1\n");
+  EXPECT_EQ(toldOf({"--session", "s2", "--from", "8"}),
+            "calls: 1 dispatch\n"
+            "timestamps: 9 to 9\n"
+            "duration: 0:00:00.000\n"
+            "  sensor  sessions  options  records\n"
+            "  LIFT           1        0        1\n" +
+                std::string(kLeak));
+  EXPECT_EQ(toldOf({"--failed"}),
+            "calls: 1 open\n"
+            "duration: 0:00:00.000\n"
+            "  sensor  sessions  options  records\n");
+}
+
+constexpr char kToSensor[] = R"({"note":"x","timeUnit":"s"}
 {"call":"open","session":"a","sensor":"STAP"}
 {"call":"dispatch","sensor":"STAP","record":{"timestamp":1,"classes":1}}
 {"call":"dispatch","sensor":"STAP","record":{"timestamp":91,"classes":1}}
-)");
+)";
+
+TEST(Info, CountsWhatIsDispatchedToAWholeSensorForTheSessionsOnIt) {
+  const std::string ofA = R"("sensors":[{"sensor":"STAP","sessions":1,"options":0,"records":1}])";
+  EXPECT_NE(runTool({"info", "--json", "--session", "a", "--from", "1s", "-"}, kToSensor).out.find(ofA),
+            std::string::npos);
+  EXPECT_NE(runTool({"info", "--json", "--session", "b", "-"}, kToSensor).out.find(R"("calls":"none","sensors":[])"),
+            std::string::npos);
+}
+
+TEST(Info, CannotTellWhichCallsFailedWhereTheTraceDoesNot) {
+  const ToolRun run = runTool({"info", "--failed", "-"}, kToSensor);
+  EXPECT_EQ(run.err,
+            "senseloom: standard input: --failed takes a recording: this trace does not tell what its calls returned, "
+            "but \"senseloom replay --failed\" does\n");
+  EXPECT_EQ(run.status, 2);
+}
+
+TEST(Info, PrintsJson) {
+  const ToolRun run = runTool({"info", "--json", "-"}, kToSensor);
   EXPECT_EQ(run.out, R"({"trace":"standard input","calls":"1 open, 2 dispatch","notes":"1","timestamps":"1 to 91",)"
                      R"("duration":"0:01:30.000","sensors":[{"sensor":"STAP","sessions":1,"options":0,"records":2}],)"
                      R"("remarks":[],"leaks":[{"session":"a","sensor":"STAP","line":2}]})"

@@ -121,6 +121,9 @@ TEST_F(PlotOf, ChosenClientsShowsThese) {
   EXPECT_NE(svg.find(">client29</text>"), std::string::npos);
   EXPECT_NE(svg.find(">client2</text>"), std::string::npos);
   EXPECT_EQ(countOf(">client", svg), 2U);
+  const ToolRun explained = runTool({"explain", "--plot", file, "--session", "client29", "-"}, traceOfClients(30));
+  EXPECT_NE(contentOf(file).find(">client29</text>"), std::string::npos) << explained.err;
+  EXPECT_EQ(countOf(">client", contentOf(file)), 1U);
 }
 
 TEST_F(PlotOf, SeveralRequestsBeforeARecordShowsThemAll) {

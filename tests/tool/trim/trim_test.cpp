@@ -27,9 +27,9 @@ const std::string kTrace = kHead + kOpenA + kOpenB + kOpenC + dispatch("a", 1) +
                            dispatch("c", 3) + dispatch("a", 4) + R"({"call":"close","session":"a","atUs":5000000})" +
                            "\n" + R"({"end":8,"lost":0})" + "\n";
 
-std::string trimmed(std::vector<std::string> arguments) {
+std::string trimmed(std::vector<std::string> arguments, const std::string& text = kTrace) {
   const ScratchFile trace("whole_trace");
-  std::ofstream(trace.name) << kTrace;
+  std::ofstream(trace.name) << text;
   arguments.insert(arguments.begin(), {"trim", trace.name});
   const ToolRun run = runTool(arguments);
   EXPECT_EQ(run.err, "");
@@ -86,6 +86,21 @@ TEST(Trim, KeepsTheReleasesOfListsThatKeptCallsGave) {
   EXPECT_EQ(part({"--sensor", "STAP"}), other + set("b", 2) + release("2") + release("null") + release("\"unknown\""));
 }
 
+TEST(Trim, KeepsTheCallsThatFailedAndWhatTheyNeed) {
+  const std::string refused = R"({"call":"dispatch","session":"c","record":{"hex":""},"returned":-1,"atUs":2000000})"
+                              "\n";
+  const std::string trace =
+      kHead + kOpenA + kOpenC + dispatch("a", 1) + refused + dispatch("c", 3) + kNote + "{\"end\":5,\"lost\":0}\n";
+  EXPECT_EQ(trimmed({"--failed"}, trace), kHead + kOpenC + refused + kNote + "{\"end\":2,\"lost\":0}\n");
+  const ScratchFile recording("refused");
+  std::ofstream(recording.name) << trace;
+  for (const std::vector<std::string>& none : {std::vector<std::string>{"--session", "a"}, {"--from", "3s"}}) {
+    std::vector<std::string> arguments{"trim", recording.name, "--failed"};
+    arguments.insert(arguments.end(), none.begin(), none.end());
+    EXPECT_EQ(runTool(arguments).err, "senseloom: " + recording.name + ": none of the calls failed\n");
+  }
+}
+
 TEST(Trim, MakesAPartThatReplaysAsRecorded) {
   const ScratchFile recording("recording");
   ASSERT_EQ(recordTo(recording.name, {TOOL_FILE, "replay", "--quiet", "commute.jsonl"}).status, 0);
@@ -132,8 +147,12 @@ TEST(Trim, OverwritesNothing) {
 }
 
 TEST(Trim, ReportsWhatItCannotDo) {
-  EXPECT_EQ(runTool({"trim", "-", "--session", "a"}).err,
-            "senseloom: standard input cannot be read twice, as naming a session takes\n");
+  const std::string readTwice = "senseloom: standard input cannot be read twice, as --session and --failed take\n";
+  EXPECT_EQ(runTool({"trim", "-", "--session", "a"}).err, readTwice);
+  EXPECT_EQ(runTool({"trim", "-", "--failed"}).err, readTwice);
+  EXPECT_EQ(runTool({"trim", "lift.jsonl", "--failed"}).err,
+            "senseloom: lift.jsonl: --failed takes a recording: this trace does not tell what its calls returned, but "
+            "\"senseloom replay --failed\" does\n");
   EXPECT_EQ(runTool({"trim", "lift.jsonl", "--session", "none"}).err,
             "senseloom: lift.jsonl: no session of that name is opened\n");
   EXPECT_EQ(runTool({"trim", "lift.jsonl", "--session", "none"}).status, 2);

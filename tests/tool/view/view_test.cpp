@@ -82,6 +82,21 @@ TEST(View, JoinsARecordThatGoesToOneSessionAfterTheOther) {
   EXPECT_NE(summary.find(R"("audiences":[[0,1],[1],[0]])"), std::string::npos) << summary;
 }
 
+TEST(View, ShowsTheCallsThatAreWanted) {
+  const std::string trace = R"({"call":"open","session":"s1","sensor":"STAP"}
+{"call":"open","session":"s2","sensor":"STAP"}
+{"call":"set_option","session":"s1","option":{}}
+{"call":"dispatch","sensor":"STAP","record":{"timestamp":1000,"classes":1}}
+{"call":"dispatch","sensor":"STAP","record":{"timestamp":9000,"classes":1}}
+)";
+  const std::string ofSession = summaryOf(pageOf(trace, {"--session", "s2"}));
+  EXPECT_NE(ofSession.find(R"("calls":3,"records":2,)"), std::string::npos) << ofSession;
+  EXPECT_EQ(ofSession.find(R"("name":"s1")"), std::string::npos) << ofSession;
+  const std::string ofTime = summaryOf(pageOf(trace, {"--from", "8s", "--time-unit", "ms"}));
+  EXPECT_NE(ofTime.find(R"("calls":1,"records":1,)"), std::string::npos) << ofTime;
+  EXPECT_NE(ofTime.find(R"("firstTimestamp":"9000")"), std::string::npos) << ofTime;
+}
+
 TEST(View, TakesItsReasonsFromExplain) {
   const std::string summary = summaryOf(pageOf(contentOf(EXAMPLES_FOLDER "/tapping.jsonl")));
   const std::string explained = runTool({"explain", "--records", "tapping.jsonl"}).out;

@@ -133,6 +133,26 @@ TEST(WatchedProgram, HasNoScreenWithoutATerminal) {
   EXPECT_EQ(run.status, 0);
 }
 
+TEST(WatchedProgram, IsShownAsFarAsItIsWanted) {
+  ProgramOnTerminal watch({TOOL_FILE, "watch", "--session", "s2", "--", DRIVEN_FILE}, recordingEnvironment(), true);
+  watch.tell("open a LIFT");
+  watch.tell("open b PHYAC");
+  watch.tell("dispatch a 1");
+  watch.tell("dispatch b 1");
+  EXPECT_EQ(watch.screenWith("defaults").find("LIFT"), std::string::npos);
+  watch.endInput();
+  EXPECT_EQ(watch.finish(), 0);
+  EXPECT_EQ(afterScreen(watch).find("LIFT"), std::string::npos);
+  EXPECT_TRUE(hasRow(afterScreen(watch), " s2 PHYAC 1 1")) << watch.output();
+}
+
+TEST(WatchedProgram, IsNotRunForAFilterThatCannotBe) {
+  const ToolRun run = runTool({"watch", "--sensor", "LIFTS", "--", "echo", "it", "ran"});
+  EXPECT_EQ(run.err, "senseloom: unknown sensor \"LIFTS\": the nearest is \"LIFT\"; `senseloom sensors` prints all\n");
+  EXPECT_EQ(run.out, "");
+  EXPECT_EQ(run.status, 2);
+}
+
 TEST(WatchedProgram, MayNotUseTheLibraryOrNotBeThere) {
   const ToolRun missing = runTool({"watch", "--", "/no/such/program"});
   EXPECT_EQ(missing.err, "senseloom: /no/such/program: No such file or directory\n");

@@ -6,7 +6,9 @@
 
 namespace senseloom::tool {
 
-void addPartOptions(CLI::App& command, FilterArguments& filter) {
+void addFilterOptions(CLI::App& command, FilterArguments& filter) {
+  command.add_option("--time-unit", filter.timeUnit, "of timestamps, where the trace does not say it")
+      ->type_name("UNIT:{s,ms,us,ns}");
   command.add_option("--session", filter.sessions, "only calls of the session of this name; may be repeated")
       ->type_name("NAME")
       ->allow_extra_args(false);
@@ -17,10 +19,6 @@ void addPartOptions(CLI::App& command, FilterArguments& filter) {
       ->type_name("LINE or TIME");
   command.add_option("--to", filter.to, "only up to this line, or up to this time, such as 5.2s")
       ->type_name("LINE or TIME");
-}
-
-void addFilterOptions(CLI::App& command, FilterArguments& filter) {
-  addPartOptions(command, filter);
   command.add_flag("--failed", filter.failed, "only calls that failed");
 }
 
@@ -28,11 +26,6 @@ void addLimitOption(CLI::App& command, size_t& most) {
   command.add_option("--limit", most, "print so many of the calls that differ, and count the others")
       ->type_name("N")
       ->check(wholeNumber(0, std::numeric_limits<uint32_t>::max()));
-}
-
-void addTimeUnitOption(CLI::App& command, std::string& unit) {
-  command.add_option("--time-unit", unit, "of timestamps, where the trace does not say it")
-      ->type_name("UNIT:{s,ms,us,ns}");
 }
 
 void addClassNamesOption(CLI::App& command, std::string& names) {

@@ -8,16 +8,12 @@
 // Options that several commands have.
 namespace senseloom::tool {
 
-// Which part of a trace is meant: by session, sensor, lines and times.
-void addPartOptions(CLI::App& command, FilterArguments& filter);
-// Which calls are shown: a part, and the calls that failed.
+// Which calls of a trace are meant: by session, sensor, lines, times and failure. All commands have them that read a
+// trace, but for those that it has other words for: of "sweep" and "convert" some have another meaning.
 void addFilterOptions(CLI::App& command, FilterArguments& filter);
 
 // How many differences are printed.
 void addLimitOption(CLI::App& command, size_t& most);
-
-// The unit of timestamps, where the trace does not say it.
-void addTimeUnitOption(CLI::App& command, std::string& unit);
 
 void addClassNamesOption(CLI::App& command, std::string& names);
 

@@ -13,14 +13,12 @@ void declareDiff(CLI::App& app, Action& action) {
   CLI::App* command = app.add_subcommand("diff", "Compare two traces session by session: calls, options, outcomes.");
   command->footer(
       "The first call of a session is compared with its first call in the other trace, and so on. Outcomes are "
-      "compared where both traces have them.\n"
+      "compared where both traces have them. Which calls failed, the recordings tell.\n"
       "Exit status: 0 when all is alike; 1 when calls differ or the output cannot be written; 2 for bad input.");
   auto arguments = std::make_shared<DiffArguments>();
   command->add_option("LEFT", arguments->left, "a trace")->required()->type_name("FILE");
   command->add_option("RIGHT", arguments->right, "another trace")->required()->type_name("FILE");
-  command->add_option("--session", arguments->sessions, "only sessions of this name; may be repeated")
-      ->type_name("NAME")
-      ->allow_extra_args(false);
+  addFilterOptions(*command, arguments->filter);
   addLimitOption(*command, arguments->most);
   command->add_flag("--json", arguments->json, "print one JSON object per call that differs");
   command->callback(

@@ -23,13 +23,16 @@ std::string subjectOf(const std::string& name, const TraceCall& call) {
 }  // namespace
 
 TraceDiff::TraceDiff(std::FILE* stream, const DiffArguments& diffArguments)
-    : out(stream), arguments(diffArguments), sides{{TraceReader(arguments.left)}, {TraceReader(arguments.right)}} {}
+    : out(stream),
+      arguments(diffArguments),
+      sides{{arguments.left, arguments.filter}, {arguments.right, arguments.filter}} {}
 
 void TraceDiff::run() {
   while (!sides[0].isAtEnd || !sides[1].isAtEnd) {
     step(0);
     step(1);
   }
+  for (const Side& side : sides) side.calls.requireOutcomes();
   for (const auto& [name, session] : sessions) {
     for (size_t side = 0; side < 2; ++side) {
       for (const TraceCall& call : session.waiting[side]) tellAlone(name, call, side);
@@ -54,10 +57,9 @@ void TraceDiff::step(size_t side) {
       return;
     }
     const std::string name = nameOf(*call);
-    const auto& wanted = arguments.sessions;
-    if (!wanted.empty() && std::find(wanted.begin(), wanted.end(), name) == wanted.end()) return;
+    if (!mine.calls.takes(*call)) return;
     Session& session = sessions[name];
-    if (call->sensor != nullptr) session.sensor = call->sensor;
+    session.sensor = mine.calls.sensor();
     auto& others = session.waiting[1 - side];
     if (others.empty()) {
       session.waiting[side].push_back(std::move(*call));

@@ -9,6 +9,8 @@
 #include <vector>
 
 #include "compare/call_difference.h"
+#include "trace/call_filter.h"
+#include "trace/recorded_calls.h"
 #include "trace/trace_reader.h"
 
 namespace senseloom::tool {
@@ -16,7 +18,7 @@ namespace senseloom::tool {
 struct DiffArguments {
   std::string left;
   std::string right;
-  std::vector<std::string> sessions = {};            // only these; empty: all
+  FilterArguments filter = {};                       // which calls of each are compared
   size_t most = std::numeric_limits<size_t>::max();  // differing calls that are printed
   bool json = false;
 };
@@ -26,7 +28,7 @@ struct DiffArguments {
 // read, so that only those are kept which the other trace has not come to.
 class TraceDiff {
  public:
-  // Throws InputError when a file cannot be opened.
+  // Throws InputError when a file cannot be opened, and as CallFilter does.
   TraceDiff(std::FILE* stream, const DiffArguments& diffArguments);
 
   // Prints the differences. Throws std::runtime_error with their number if there are any, and InputError as
@@ -35,7 +37,9 @@ class TraceDiff {
 
  private:
   struct Side {
+    Side(const std::string& file, const FilterArguments& filter) : reader(file), calls(filter, reader) {}
     TraceReader reader;
+    RecordedCalls calls;
     bool isAtEnd = false;
   };
   struct Session {

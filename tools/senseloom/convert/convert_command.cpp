@@ -17,7 +17,7 @@ constexpr char kFormatsHelp[] =
     "--from csv: a table with a heading, and a row a decision, in order of time: cells between commas. The trace has a "
     "record a row, dispatched to the sensor; times are rounded to milliseconds, unless their unit is shorter.\n"
     "--to perfetto: trace events as JSON, for viewers of system traces. --to csv: a table with a row per call and "
-    "session, with what became of each record and why.\n"
+    "session, with what became of each record and why. A part of a trace: senseloom trim cuts it out.\n"
     "Exit status: 0; 1 when the output cannot be written; 2 for bad input.";
 
 struct ConvertArguments {

@@ -51,7 +51,6 @@ void declareExplain(CLI::App& app, Action& action) {
       ->excludes(records)
       ->excludes(all);
   command->add_flag("--json", arguments->form.json, "print one JSON object per call");
-  addTimeUnitOption(*command, arguments->form.filter.timeUnit);
   addFilterOptions(*command, arguments->form.filter);
   command->add_flag("--follow", arguments->form.follows, "wait for more until the recording has its end")
       ->excludes(options);

@@ -76,9 +76,11 @@ void explainTrace(std::FILE* out, const std::string& file, const ExplanationForm
   const auto show = [out, hasPicture = !plot.file.empty()] { showSoFar(out, hasPicture); };
   TraceReader trace = openTrace(file, {.follows = form.follows, .meanwhile = show});
   LogCapture log;
-  const auto output = withFilter(makeOutput(out, form), form.filter, trace);
-  auto explainer = std::make_unique<Explainer>(*output, log);
-  const auto observer = withProgress(withPlot(std::move(explainer), trace, plot), trace, out, !form.extent.problems);
+  const auto output = makeOutput(out, form);
+  CallFilter filter(form.filter, trace);
+  FilteredExplanation filtered(*output, filter);
+  auto drawn = withPlot(std::make_unique<Explainer>(filtered, log), trace, plot, form.filter);
+  const auto observer = withProgress(std::move(drawn), trace, out, !form.extent.problems);
   Replayer(*observer).replay(trace);
 }
 

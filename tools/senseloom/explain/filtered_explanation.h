@@ -1,14 +1,22 @@
 #pragma once
 
-#include <memory>
-
 #include "explain/explanation.h"
 #include "trace/call_filter.h"
 
 namespace senseloom::tool {
 
-// Passes on what a filter takes. An output without a filter is returned as it is.
-std::unique_ptr<ExplanationOutput> withFilter(std::unique_ptr<ExplanationOutput> output,
-                                              const FilterArguments& arguments, const TraceReader& trace);
+// Passes on what a filter takes.
+class FilteredExplanation final : public ExplanationOutput {
+ public:
+  FilteredExplanation(ExplanationOutput& explanations, CallFilter& callFilter)
+      : output(explanations), filter(callFilter) {}
+  void onCall(const ExplainedCall& call) override;
+  void onRecord(const ExplainedRecord& record) override;
+  void onEnd(const std::vector<Account>& accounts) override;
+
+ private:
+  ExplanationOutput& output;
+  CallFilter& filter;
+};
 
 }  // namespace senseloom::tool

@@ -4,6 +4,7 @@
 #include <memory>
 #include <string>
 
+#include "command_line/call_options.h"
 #include "info/trace_info.h"
 
 namespace senseloom::tool {
@@ -11,6 +12,7 @@ namespace {
 
 struct InfoArguments {
   std::string trace;
+  FilterArguments filter;
   bool json = false;
 };
 
@@ -22,8 +24,9 @@ void declareInfo(CLI::App& app, Action& action) {
   auto arguments = std::make_shared<InfoArguments>();
   command->add_option("TRACE", arguments->trace, "the trace; - is standard input")->required()->type_name("FILE");
   command->add_flag("--json", arguments->json, "print one JSON object");
+  addFilterOptions(*command, arguments->filter);
   command->callback([arguments, &action] {
-    action = [arguments](std::FILE* out) { printInfo(out, arguments->trace, arguments->json); };
+    action = [arguments](std::FILE* out) { printInfo(out, arguments->trace, arguments->filter, arguments->json); };
   });
 }
 

@@ -12,8 +12,8 @@
 #include "input_error.h"
 #include "terminal/text_table.h"
 #include "trace/json.h"
-#include "trace/record_codec.h"
 #include "trace/record_field.h"
+#include "trace/recorded_calls.h"
 #include "trace/time_unit.h"
 #include "trace/trace_reader.h"
 #include "trace/trace_time.h"
@@ -30,6 +30,7 @@ struct SensorCounts {
 struct OpenSession {
   const Sensor* sensor;
   size_t line;
+  bool isShown = false;  // one of its calls is wanted
 };
 
 // What is told of a trace, as (name, text), for people and for programs alike.
@@ -37,14 +38,18 @@ using Fact = std::pair<std::string, std::string>;
 
 class TraceInfo {
  public:
-  explicit TraceInfo(const std::string& file)
-      : reader(file, [this](const std::string& remark) { remarks.push_back(remark); }) {
+  TraceInfo(const std::string& file, const FilterArguments& arguments)
+      : reader(file, [this](const std::string& remark) { remarks.push_back(remark); }),
+        shown(arguments),
+        filter(arguments, reader) {
     reader.listen([this](size_t line, const Json& aside) { takeAside(line, aside); });
     try {
       while (const auto call = reader.next()) take(*call);
     } catch (const InputError& error) {
       throw InputError(reader.position() + ": " + error.what());
     }
+    filter.requireOutcomes();
+    std::erase_if(open, [](const auto& session) { return !session.second.isShown; });
     for (const std::string& wrong : lists.wrongReleases()) remarks.push_back(reader.fileName() + ':' + wrong);
   }
 
@@ -101,32 +106,44 @@ class TraceInfo {
   }
 
   void take(const TraceCall& call) {
-    ++calls[static_cast<size_t>(call.kind)];
-    lists.take(call);
+    const bool isWanted = filter.takes(call);
     if (call.kind == CallKind::open) takeOpen(call);
-    const Sensor* sensor = call.sensor;
-    if (sensor == nullptr && call.kind != CallKind::uninit) {
-      const auto session = open.find(call.session);
-      if (session == open.end()) return;  // one that did not open
-      sensor = session->second.sensor;
-    }
-    if (call.kind == CallKind::setOption) ++sensors[sensor].options;
-    if (call.kind == CallKind::dispatch) takeRecord(*sensor, call);
+    if (isWanted) count(call);
     if (call.kind == CallKind::close) open.erase(call.session);
-    if (call.atMicroseconds) lastMicroseconds = call.atMicroseconds;
   }
 
   void takeOpen(const TraceCall& call) {
     const json_t* returned = json_object_get(call.recorded.get(), member::kReturned);
-    if (json_is_null(returned)) return;  // it did not open
-    ++sensors[call.sensor].sessions;
-    open[call.session] = {call.sensor, call.line};
+    if (!json_is_null(returned)) open[call.session] = {call.sensor, call.line};
   }
 
-  void takeRecord(const Sensor& sensor, const TraceCall& call) {
+  void count(const TraceCall& call) {
+    ++calls[static_cast<size_t>(call.kind)];
+    lists.take(call);
+    if (call.atMicroseconds) {
+      if (!firstMicroseconds) firstMicroseconds = call.atMicroseconds;
+      lastMicroseconds = call.atMicroseconds;
+    }
+    if (call.kind == CallKind::dispatch && call.session.empty()) {
+      for (auto& [name, session] : open) {
+        if (session.sensor == call.sensor && filter.takes(name, session.sensor)) show(session);
+      }
+    } else if (call.kind != CallKind::uninit) {
+      const auto session = open.find(call.session);
+      if (session == open.end()) return;  // one that did not open
+      show(session->second);
+    }
+    if (call.kind == CallKind::setOption) ++sensors[filter.sensor()].options;
+    if (call.kind == CallKind::dispatch) takeRecord(*filter.sensor());
+  }
+
+  void show(OpenSession& session) {
+    if (!std::exchange(session.isShown, true)) ++sensors[session.sensor].sessions;
+  }
+
+  void takeRecord(const Sensor& sensor) {
     ++sensors[&sensor].records;
-    const auto record = encodeRecord(sensor, call.record.get());
-    const auto timestamp = recordField<uint64_t>(record, kTimestampOffset);
+    const auto timestamp = recordField<uint64_t>(filter.record(), kTimestampOffset);
     if (!timestamp) return;
     if (!firstTimestamp) firstTimestamp = timestamp;
     lastTimestamp = timestamp;
@@ -147,7 +164,7 @@ class TraceInfo {
     }
     list.emplace_back("calls", text.empty() ? "none" : text);
     if (const std::string counts = lists.counts(); !counts.empty()) list.emplace_back("lists", counts);
-    if (notes > 0) list.emplace_back("notes", std::to_string(notes));
+    if (notes > 0 && shown.takesAll()) list.emplace_back("notes", std::to_string(notes));
     if (firstTimestamp) {
       list.emplace_back("timestamps", std::to_string(*firstTimestamp) + " to " + std::to_string(*lastTimestamp));
     }
@@ -156,14 +173,17 @@ class TraceInfo {
   }
 
   std::optional<int64_t> duration() const {
-    if (lastMicroseconds) return *lastMicroseconds * 1000;
-    const auto unit = reader.timeUnit();
+    // All of a recording begins before its first call.
+    if (lastMicroseconds) return (*lastMicroseconds - (shown.takesAll() ? 0 : *firstMicroseconds)) * 1000;
+    const auto unit = shown.unit() ? shown.unit() : reader.timeUnit();
     if (!unit || !firstTimestamp || *lastTimestamp < *firstTimestamp) return std::nullopt;
     return timeOf(*lastTimestamp - *firstTimestamp, *unit);
   }
 
   std::vector<std::string> remarks;
   TraceReader reader;
+  const FilterArguments shown;
+  RecordedCalls filter;
   Json head;
   std::array<size_t, kAllCalls.size()> calls{};
   size_t notes = 0;
@@ -172,13 +192,14 @@ class TraceInfo {
   ListLeaks lists;
   std::optional<uint64_t> firstTimestamp;
   std::optional<uint64_t> lastTimestamp;
+  std::optional<int64_t> firstMicroseconds;
   std::optional<int64_t> lastMicroseconds;
 };
 
 }  // namespace
 
-void printInfo(std::FILE* out, const std::string& trace, bool json) {
-  const TraceInfo info(trace);
+void printInfo(std::FILE* out, const std::string& trace, const FilterArguments& filter, bool json) {
+  const TraceInfo info(trace, filter);
   if (json) {
     info.printJson(out);
   } else {

@@ -9,13 +9,16 @@
 namespace senseloom::tool {
 
 ReplayPlot::ReplayPlot(std::unique_ptr<ReplayObserver> replayOutput, const TraceReader& reader,
-                       PlotArguments plotArguments)
-    : output(std::move(replayOutput)), trace(reader), arguments(std::move(plotArguments)) {
+                       PlotArguments plotArguments, const FilterArguments& filterArguments)
+    : output(std::move(replayOutput)),
+      trace(reader),
+      arguments(std::move(plotArguments)),
+      filter(filterArguments, reader) {
   requireWritable(arguments.file, std::span(&trace.fileName(), 1));
 }
 
 void ReplayPlot::onOutcome(const CallOutcome& outcome) {
-  plot.onOutcome(outcome);
+  if (filter.takes(outcome)) plot.onOutcome(outcome);
   output->onOutcome(outcome);
 }
 
@@ -35,9 +38,9 @@ ClassNames classNamesOf(const std::string& given, const TraceReader& trace) {
 }
 
 std::unique_ptr<ReplayObserver> withPlot(std::unique_ptr<ReplayObserver> output, const TraceReader& trace,
-                                         const PlotArguments& arguments) {
+                                         const PlotArguments& arguments, const FilterArguments& filter) {
   if (arguments.file.empty()) return output;
-  return std::make_unique<ReplayPlot>(std::move(output), trace, arguments);
+  return std::make_unique<ReplayPlot>(std::move(output), trace, arguments, filter);
 }
 
 }  // namespace senseloom::tool

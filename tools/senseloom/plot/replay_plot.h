@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "plot/plot.h"
+#include "trace/call_filter.h"
 #include "trace/class_names.h"
 #include "trace/replayer.h"
 #include "trace/trace_reader.h"
@@ -18,11 +19,12 @@ struct PlotArguments {
   std::string classNames = {};  // for readClassNames(); empty: those of the trace
 };
 
-// Passes everything on to an output, and at the end writes a picture of the replay. Throws as requireWritable() does,
-// at once.
+// Passes everything on to an output, and at the end writes a picture of those calls that a filter takes. Throws as
+// requireWritable() and CallFilter do, at once.
 class ReplayPlot final : public ReplayObserver {
  public:
-  ReplayPlot(std::unique_ptr<ReplayObserver> replayOutput, const TraceReader& reader, PlotArguments plotArguments);
+  ReplayPlot(std::unique_ptr<ReplayObserver> replayOutput, const TraceReader& reader, PlotArguments plotArguments,
+             const FilterArguments& filterArguments);
   void onOutcome(const CallOutcome& outcome) override;
   void onNote(size_t line, const std::string& text) override { output->onNote(line, text); }
   void onEnd() override;
@@ -31,6 +33,7 @@ class ReplayPlot final : public ReplayObserver {
   std::unique_ptr<ReplayObserver> output;
   const TraceReader& trace;
   const PlotArguments arguments;
+  CallFilter filter;
   Plot plot;
 };
 
@@ -41,6 +44,6 @@ ClassNames classNamesOf(const std::string& given, const TraceReader& trace);
 
 // Adds a picture of a trace to an output, if one is wanted.
 std::unique_ptr<ReplayObserver> withPlot(std::unique_ptr<ReplayObserver> output, const TraceReader& trace,
-                                         const PlotArguments& arguments);
+                                         const PlotArguments& arguments, const FilterArguments& filter);
 
 }  // namespace senseloom::tool

@@ -22,7 +22,6 @@
 #include "terminal/interrupt.h"
 #include "terminal/shown_output.h"
 #include "trace/replayer.h"
-#include "trace/time_unit.h"
 #include "trace/trace_reader.h"
 
 namespace senseloom::tool {
@@ -74,7 +73,7 @@ std::unique_ptr<ReplayObserver> makeOutput(std::FILE* out, const ReplayArguments
   if (arguments.quiet) return std::make_unique<SummaryOutput>(out);
   TableForm form = arguments.table;
   if (!arguments.times.empty()) form.times = arguments.times == "clock" ? Times::clock : Times::elapsed;
-  if (!arguments.filter.timeUnit.empty()) form.timeUnit = timeUnitNamed(arguments.filter.timeUnit);
+  form.timeUnit = arguments.filter.unit();
   if (!arguments.plot.classNames.empty()) form.classNames = readClassNames(arguments.plot.classNames);
   return std::make_unique<TableOutput>(out, form, trace);
 }
@@ -86,8 +85,9 @@ void replay(std::FILE* out, const ReplayArguments& arguments) {
                     {.follows = arguments.follows, .meanwhile = show});
   __android_log_set_minimum_priority(kLogLevels.at(arguments.log));
   const bool isFilling = !arguments.quiet && !arguments.check;
-  auto shown = withFilter(withPlot(makeOutput(out, arguments, trace), trace, arguments.plot), arguments.filter, trace);
-  const auto output = withProgress(std::move(shown), trace, out, isFilling);
+  auto shown = withFilter(makeOutput(out, arguments, trace), arguments.filter, trace);
+  auto drawn = withPlot(std::move(shown), trace, arguments.plot, arguments.filter);
+  const auto output = withProgress(std::move(drawn), trace, out, isFilling);
   Replayer(*output).replay(trace);
 }
 
@@ -117,7 +117,6 @@ void declareReplay(CLI::App& app, Action& action) {
       ->type_name("TIMES")
       ->check(oneOf({"elapsed", "clock"}));
   addLimitOption(*command, arguments->most);
-  addTimeUnitOption(*command, arguments->filter.timeUnit);
   addFilterOptions(*command, arguments->filter);
   command->add_flag("--follow", arguments->follows, "wait for more until the recording has its end");
   addPlotOptions(*command, arguments->plot);

@@ -35,6 +35,7 @@ constexpr char kDefinitions[] =
 constexpr char kFooter[] =
     "Where the truth is a member \"truth\" of a dispatch in the trace, or a file: a row a time and a class, the label "
     "of all records from that time on. 0 or none: not labelled.\n"
+    "A part of a trace: senseloom trim cuts it out.\n"
     "Exit status: 0; 1 when the output cannot be written; 2 for bad input, also when the library replaces or refuses "
     "a value: the row has a mark then.";
 

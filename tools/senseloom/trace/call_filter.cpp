@@ -13,10 +13,6 @@ bool isAmong(const std::vector<std::string>& names, const std::string& name) {
   return names.empty() || std::find(names.begin(), names.end(), name) != names.end();
 }
 
-std::optional<int64_t> unitOf(const std::string& name) {
-  return name.empty() ? std::nullopt : std::optional(timeUnitNamed(name));
-}
-
 class FilteredOutput final : public ReplayObserver {
  public:
   FilteredOutput(std::unique_ptr<ReplayObserver> replayOutput, const FilterArguments& arguments,
@@ -38,12 +34,22 @@ bool FilterArguments::takesAll() const {
   return sessions.empty() && sensors.empty() && from.empty() && to.empty() && !failed;
 }
 
+std::optional<int64_t> FilterArguments::unit() const {
+  return timeUnit.empty() ? std::nullopt : std::optional(timeUnitNamed(timeUnit));
+}
+
 CallFilter::CallFilter(const FilterArguments& filterArguments, const TraceReader& trace)
     : arguments(filterArguments),
       from(readEnd(arguments.from)),
       to(readEnd(arguments.to)),
-      time(trace, unitOf(arguments.timeUnit)) {
+      time(trace, arguments.unit()) {
+  check(arguments);
+}
+
+void CallFilter::check(const FilterArguments& arguments) {
   for (const std::string& sensor : arguments.sensors) sensorNamed(sensor);
+  readEnd(arguments.from);
+  readEnd(arguments.to);
 }
 
 bool CallFilter::takes(const CallOutcome& outcome) {

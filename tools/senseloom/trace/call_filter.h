@@ -22,12 +22,16 @@ struct FilterArguments {
   std::string timeUnit = {};  // of timestamps; empty: as the trace says
 
   bool takesAll() const;
+  // In nanoseconds; nothing: as the trace says.
+  std::optional<int64_t> unit() const;
 };
 
 // Tells which calls are to be shown. All calls of a trace are passed to it, in order.
 class CallFilter {
  public:
   // Throws InputError when there is no such sensor, or an end is neither a line nor a time.
+  static void check(const FilterArguments& arguments);
+  // Throws as check().
   CallFilter(const FilterArguments& filterArguments, const TraceReader& trace);
 
   // Throws InputError when an end is a time and the trace does not tell any.

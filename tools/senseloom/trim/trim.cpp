@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <functional>
-#include <map>
 #include <memory>
 #include <optional>
 #include <string_view>
@@ -14,8 +13,8 @@
 #include "model/kinds.h"
 #include "terminal/new_file.h"
 #include "terminal/output_sink.h"
-#include "trace/record_codec.h"
 #include "trace/record_field.h"
+#include "trace/recorded_calls.h"
 #include "trace/trace_reader.h"
 
 namespace senseloom::tool {
@@ -27,21 +26,26 @@ constexpr mode_t kOwnerAlone = 0600;  // a trace holds what the sensors saw
 
 void discard(const std::string& /*remark*/) {}
 
-// The sensors of the sessions of these names.
-std::vector<std::string> sensorsOf(const std::string& trace, const std::vector<std::string>& sessions) {
-  if (trace == "-") throw InputError("standard input cannot be read twice, as naming a session takes");
+// The sensors of the sessions that are named, or of the calls that failed if those are wanted.
+std::vector<std::string> sensorsOf(const std::string& trace, const FilterArguments& arguments) {
+  if (trace == "-") throw InputError("standard input cannot be read twice, as --session and --failed take");
   TraceReader reader(trace, discard);
+  RecordedCalls calls(arguments, reader);
   std::vector<std::string> sensors;
   try {
     while (const auto call = reader.next()) {
-      const bool isNamed = std::find(sessions.begin(), sessions.end(), call->session) != sessions.end();
-      if (call->kind == CallKind::open && isNamed) sensors.emplace_back(call->sensor->name);
+      const bool isTaken = calls.takes(*call);
+      const bool isNamed = call->kind == CallKind::open && calls.takes(call->session, call->sensor);
+      if (calls.sensor() != nullptr && (arguments.failed ? isTaken : isNamed)) {
+        sensors.emplace_back(calls.sensor()->name);
+      }
     }
   } catch (const InputError& error) {
     throw InputError(reader.position() + ": " + error.what());
   }
-  if (sensors.empty()) throw InputError(trace + ": no session of that name is opened");
-  return sensors;
+  calls.requireOutcomes();
+  if (!sensors.empty()) return sensors;
+  throw InputError(trace + (arguments.failed ? ": none of the calls failed" : ": no session of that name is opened"));
 }
 
 // A record from before the part, without its outcome.
@@ -54,8 +58,12 @@ struct Carried {
 class Trimmer {
  public:
   Trimmer(std::FILE* stream, const std::string& trace, const std::string& file, const FilterArguments& arguments)
-      : out(stream), reader(trace), filter(arguments, reader), sensors(arguments.sensors) {
-    if (!arguments.sessions.empty()) sensors = sensorsOf(trace, arguments.sessions);
+      : out(stream),
+        reader(trace),
+        filter(arguments, reader),
+        sensors(arguments.sensors),
+        isFailedOnly(arguments.failed) {
+    if (!arguments.sessions.empty() || arguments.failed) sensors = sensorsOf(trace, arguments);
     requireEmpty(file);
     if (!file.empty()) target.emplace(file, kOwnerAlone, NewFile::Rest::removed);
     reader.listen([this](size_t, const Json& aside) { takeAside(aside); });
@@ -86,19 +94,17 @@ class Trimmer {
   }
 
   void take(const TraceCall& call) {
-    const Sensor* sensor = sensorOf(call);
-    if (!isConcerned(sensor)) return;
-    const auto record = call.record == nullptr ? std::vector<uint8_t>() : encodeRecord(*sensor, call.record.get());
-    const CallOutcome outcome{.call = call, .session = call.session, .sensor = sensor, .record = record};
-    // A dispatch to a whole sensor goes to the sessions that are wanted, too.
-    const bool isWanted = filter.takes(outcome) || (call.session.empty() && filter.isWithin(outcome));
-    if (filter.isBehind(outcome)) return;
-    const bool isBefore = !filter.isWithin(outcome);
+    const bool isWanted = filter.takes(call);
+    const Sensor* sensor = filter.sensor();
+    const bool isOfSession = call.kind != CallKind::uninit;
+    if (isOfSession && sensor == nullptr) throw InputError("no session \"" + call.session + "\" is open");
+    if (!isConcerned(sensor) || filter.isBehind()) return;
+    const bool isBefore = !filter.isWithin();
     if (!isBefore) writeCarried();
-    if (isBefore) carry(call, sensor);
-    if (call.engine) engine = {recordField<uint64_t>(record, kTimestampOffset), engineOfLine()};
+    if (isBefore && !isFailedOnly) carry(call, sensor);
+    if (call.engine) engine = {recordField<uint64_t>(filter.record(), kTimestampOffset), engineOfLine()};
     if (call.kind == CallKind::dispatch && !isWanted) return;
-    if (call.kind == CallKind::dispatch && sensor->items == Items::samples) return writeGesture(call, record);
+    if (call.kind == CallKind::dispatch && sensor->items == Items::samples) return writeGesture(call);
     if (call.list != 0) keptLists.insert(call.list);
     const bool isResumed =
         call.kind == CallKind::open && isBefore && call.recorded != nullptr && filter.takes(call.session, sensor);
@@ -130,9 +136,9 @@ class Trimmer {
 
   // The gesture engine is asked about a record once, whatever the number of its sessions. What it answered stays with
   // the first of them that is kept.
-  void writeGesture(const TraceCall& call, std::span<const uint8_t> record) {
+  void writeGesture(const TraceCall& call) {
     const bool isFirst =
-        engine.answers != nullptr && engine.timestamp == recordField<uint64_t>(record, kTimestampOffset);
+        engine.answers != nullptr && engine.timestamp == recordField<uint64_t>(filter.record(), kTimestampOffset);
     Json answers = isFirst ? std::move(engine.answers) : nullptr;
     writeCall(call.engine || answers == nullptr ? std::string(reader.line()) : changed([&](const Json& line) {
       addMember(line, member::kEngine, std::move(answers));
@@ -149,13 +155,6 @@ class Trimmer {
     carried.clear();
   }
 
-  const Sensor* sensorOf(const TraceCall& call) {
-    if (call.kind == CallKind::open) opened[call.session] = call.sensor;
-    if (call.sensor != nullptr || call.kind == CallKind::uninit) return call.sensor;
-    const auto known = opened.find(call.session);
-    if (known == opened.end()) throw InputError("no session \"" + call.session + "\" is open");
-    return known->second;
-  }
   // What is no sensor's concerns all.
   bool isConcerned(const Sensor* sensor) const {
     return sensor == nullptr || sensors.empty() ||
@@ -187,11 +186,11 @@ class Trimmer {
 
   std::FILE* out;
   TraceReader reader;
-  CallFilter filter;
+  RecordedCalls filter;
   std::vector<std::string> sensors;  // concerned; empty: all
+  const bool isFailedOnly;           // what a record is refused for has nothing to do with those before it
   std::optional<NewFile> target;
-  std::unordered_set<int64_t> keptLists;        // by their numbers
-  std::map<std::string, const Sensor*> opened;  // sessions by name, as opened last
+  std::unordered_set<int64_t> keptLists;  // by their numbers
   std::vector<Carried> carried;
   struct {
     std::optional<uint64_t> timestamp;

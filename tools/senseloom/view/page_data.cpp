@@ -42,10 +42,12 @@ Json hueTexts(const Sensor& sensor, const RecordHues& shown, const std::vector<s
 }  // namespace
 
 void PageData::onOutcome(const CallOutcome& outcome) {
-  if (outcome.call.line != 0 && outcome.call.line != lastLine) ++calls;
-  lastLine = outcome.call.line;
-  const bool isOpen = outcome.call.kind == CallKind::open;
-  if (isOpen && !outcome.failed) addEvent(outcome, Json(json_object()));
+  if (filter.takes(outcome)) {
+    if (outcome.call.line != 0 && outcome.call.line != lastLine) ++calls;
+    lastLine = outcome.call.line;
+    const bool isOpen = outcome.call.kind == CallKind::open;
+    if (isOpen && !outcome.failed) addEvent(outcome, Json(json_object()));
+  }
   explainer.onOutcome(outcome);
 }
 

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "explain/explainer.h"
+#include "explain/filtered_explanation.h"
 #include "explain/log_capture.h"
 #include "trace/json.h"
 #include "trace/record_joiner.h"
@@ -17,11 +18,13 @@
 namespace senseloom::tool {
 
 // Gathers what a page shows of a replay: each record with what became of it for each session, and every other call with
-// what it negotiated. What goes to several sessions one after the other, byte for byte, is one record.
+// what it negotiated, of the calls that a filter takes. What goes to several sessions one after the other, byte for
+// byte, is one record.
 class PageData final : public ReplayObserver, private ExplanationOutput {
  public:
   // `source` is where the library's log goes.
-  explicit PageData(LogSource& source) : explainer(*this, source) {}
+  PageData(LogSource& source, CallFilter& callFilter)
+      : filter(callFilter), filtered(*this, filter), explainer(filtered, source) {}
   void onOutcome(const CallOutcome& outcome) override;
   void onEnd() override;
 
@@ -55,6 +58,8 @@ class PageData final : public ReplayObserver, private ExplanationOutput {
   uint32_t sensorOf(const Sensor* sensor);
   uint32_t clientOf(const CallOutcome& outcome);
 
+  CallFilter& filter;
+  FilteredExplanation filtered;
   Explainer explainer;
   std::vector<ShownSensor> sensors;
   std::vector<Client> clients;

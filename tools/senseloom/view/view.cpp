@@ -20,13 +20,15 @@ void view(std::FILE* out, const ViewArguments& arguments) {
   TraceReader trace(arguments.trace);
   OutputSink sink(out, arguments.page, arguments.trace);
   LogCapture log;
-  auto data = std::make_unique<PageData>(log);
+  CallFilter filter(arguments.filter, trace);
+  auto data = std::make_unique<PageData>(log, filter);
   const PageData& gathered = *data;
   const auto output = withProgress(std::move(data), trace, out, false);
   Replayer(*output).replay(trace);
+  const auto unit = arguments.filter.unit();
   writePage(sink, gathered,
             {.title = traceTitle(arguments.trace),
-             .timeUnit = trace.timeUnit(),
+             .timeUnit = unit ? unit : trace.timeUnit(),
              .classNames = classNamesOf(arguments.classNames, trace)});
   sink.commit();
 }

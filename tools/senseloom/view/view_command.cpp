@@ -20,6 +20,7 @@ void declareView(CLI::App& app, Action& action) {
   command->add_option("-o,--output", arguments->page, "the page; else it is written to standard output")
       ->type_name("FILE");
   addClassNamesOption(*command, arguments->classNames);
+  addFilterOptions(*command, arguments->filter);
   command->callback([arguments, &action] { action = [arguments](std::FILE* out) { view(out, *arguments); }; });
 }
 

@@ -13,16 +13,21 @@ constexpr std::chrono::milliseconds kInterval(100);
 
 }  // namespace
 
-LiveBoard::LiveBoard(std::FILE* output, std::string heading)
-    : out(output), title(std::move(heading)), explainer(board, log) {
+LiveBoard::LiveBoard(std::FILE* output, std::string heading) : out(output), title(std::move(heading)) {
   if (!TerminalScreen::isPossible(out)) return;
   held.emplace();
   screen.emplace(out);
 }
 
+void LiveBoard::begin(const FilterArguments& filterArguments, const TraceReader& trace) {
+  filter.emplace(filterArguments, trace);
+  filtered.emplace(board, *filter);
+  explainer.emplace(*filtered, log);
+}
+
 void LiveBoard::onOutcome(const CallOutcome& outcome) {
-  explainer.onOutcome(outcome);
-  board.onOutcome(outcome);
+  explainer->onOutcome(outcome);
+  if (filter->takes(outcome)) board.onOutcome(outcome);
   refresh();
 }
 

@@ -6,8 +6,11 @@
 #include <vector>
 
 #include "explain/explainer.h"
+#include "explain/filtered_explanation.h"
 #include "explain/log_capture.h"
+#include "trace/call_filter.h"
 #include "trace/replayer.h"
+#include "trace/trace_reader.h"
 #include "watch/board.h"
 #include "watch/board_view.h"
 #include "watch/held_output.h"
@@ -23,9 +26,11 @@ class LiveBoard final : public ReplayObserver {
  public:
   // `heading` says what is watched.
   LiveBoard(std::FILE* out, std::string heading);
+  // What is shown of the trace, which is replayed next. Throws InputError as CallFilter does.
+  void begin(const FilterArguments& filterArguments, const TraceReader& trace);
 
   void onOutcome(const CallOutcome& outcome) override;
-  void onEnd() override { explainer.onEnd(); }
+  void onEnd() override { explainer->onEnd(); }
 
   // Reads keys and draws the screen, unless that was done within the last tenth of a second.
   void refresh();
@@ -43,7 +48,9 @@ class LiveBoard final : public ReplayObserver {
   const std::string title;
   LogCapture log;
   Board board;
-  Explainer explainer;
+  std::optional<CallFilter> filter;  // all three from begin() on
+  std::optional<FilteredExplanation> filtered;
+  std::optional<Explainer> explainer;
   BoardView view;
   std::vector<BoardRow> rows;  // as they are shown
   Board::Clock::time_point nextRefresh = Board::Clock::time_point::min();

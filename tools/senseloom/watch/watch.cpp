@@ -59,24 +59,27 @@ void readAsInput(const Pipe& recording) {
 
 }  // namespace
 
-void watchTrace(std::FILE* out, const std::string& file) {
+void watchTrace(std::FILE* out, const std::string& file, const FilterArguments& filter) {
   const InterruptMark mark;
   std::optional<LiveBoard> board;
   TraceReader trace(file, TraceReader::printOnStandardError,
                     {.follows = true, .meanwhile = [&board] { board->refresh(); }});
   board.emplace(out, file == "-" ? "standard input" : file);
+  board->begin(filter, trace);
   Replayer(*board).replay(trace);
   board->finish();
   if (board->wasQuit()) forgetInterrupt();
 }
 
-void watchProgram(std::FILE* out, const std::vector<std::string>& command) {
+void watchProgram(std::FILE* out, const std::vector<std::string>& command, const FilterArguments& filter) {
+  CallFilter::check(filter);  // before the program runs
   LiveBoard board(out, command.front());
   const Pipe lines = makePipe();
   ChildProgram recording(recordingOf(command), {}, inputBeside(board), lines.writeEnd);
   readAsInput(lines);
   // What there is to remark upon, the recording says.
   TraceReader trace("-", [](const std::string&) {}, {.follows = true, .meanwhile = [&board] { board.refresh(); }});
+  board.begin(filter, trace);
   Replayer(board).replay(trace);
   while (!recording.hasEnded()) poll(nullptr, 0, kPatience);
   board.finish();

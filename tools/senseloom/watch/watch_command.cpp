@@ -6,6 +6,7 @@
 #include <string>
 #include <vector>
 
+#include "command_line/call_options.h"
 #include "watch/watch.h"
 
 namespace senseloom::tool {
@@ -14,13 +15,14 @@ namespace {
 struct WatchArguments {
   std::string trace;
   std::vector<std::string> program;
+  FilterArguments filter;
 };
 
 void watch(std::FILE* out, const WatchArguments& arguments) {
   if (arguments.program.empty()) {
-    watchTrace(out, arguments.trace);
+    watchTrace(out, arguments.trace, arguments.filter);
   } else {
-    watchProgram(out, arguments.program);
+    watchProgram(out, arguments.program, arguments.filter);
   }
 }
 
@@ -40,6 +42,7 @@ void declareWatch(CLI::App& app, Action& action) {
   auto* program =
       command->add_option("COMMAND", arguments->program, "behind --: the program to watch, and its arguments")
           ->type_name("PROGRAM");
+  addFilterOptions(*command, arguments->filter);
   command->callback([arguments, command, trace, program, &action] {
     if (trace->empty()) throw CLI::RequiredError("TRACE or -- PROGRAM");
     const std::vector<std::string> rest = command->remaining();
