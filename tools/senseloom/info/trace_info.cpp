@@ -173,7 +173,7 @@ class TraceInfo {
   }
 
   std::optional<int64_t> duration() const {
-    // All of a recording begins before its first call.
+    // A recording as a whole began before its first call.
     if (lastMicroseconds) return (*lastMicroseconds - (shown.takesAll() ? 0 : *firstMicroseconds)) * 1000;
     const auto unit = shown.unit() ? shown.unit() : reader.timeUnit();
     if (!unit || !firstTimestamp || *lastTimestamp < *firstTimestamp) return std::nullopt;

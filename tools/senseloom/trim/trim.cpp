@@ -1,9 +1,9 @@
 #include "trim/trim.h"
 
-#include <algorithm>
 #include <functional>
 #include <memory>
 #include <optional>
+#include <set>
 #include <string_view>
 #include <unordered_set>
 #include <utility>
@@ -27,17 +27,17 @@ constexpr mode_t kOwnerAlone = 0600;  // a trace holds what the sensors saw
 void discard(const std::string& /*remark*/) {}
 
 // The sensors of the sessions that are named, or of the calls that failed if those are wanted.
-std::vector<std::string> sensorsOf(const std::string& trace, const FilterArguments& arguments) {
+std::set<std::string> sensorsOf(const std::string& trace, const FilterArguments& arguments) {
   if (trace == "-") throw InputError("standard input cannot be read twice, as --session and --failed take");
   TraceReader reader(trace, discard);
   RecordedCalls calls(arguments, reader);
-  std::vector<std::string> sensors;
+  std::set<std::string> sensors;
   try {
     while (const auto call = reader.next()) {
       const bool isTaken = calls.takes(*call);
       const bool isNamed = call->kind == CallKind::open && calls.takes(call->session, call->sensor);
       if (calls.sensor() != nullptr && (arguments.failed ? isTaken : isNamed)) {
-        sensors.emplace_back(calls.sensor()->name);
+        sensors.insert(calls.sensor()->name);
       }
     }
   } catch (const InputError& error) {
@@ -61,7 +61,7 @@ class Trimmer {
       : out(stream),
         reader(trace),
         filter(arguments, reader),
-        sensors(arguments.sensors),
+        sensors(arguments.sensors.begin(), arguments.sensors.end()),
         isFailedOnly(arguments.failed) {
     if (!arguments.sessions.empty() || arguments.failed) sensors = sensorsOf(trace, arguments);
     requireEmpty(file);
@@ -96,8 +96,8 @@ class Trimmer {
   void take(const TraceCall& call) {
     const bool isWanted = filter.takes(call);
     const Sensor* sensor = filter.sensor();
-    const bool isOfSession = call.kind != CallKind::uninit;
-    if (isOfSession && sensor == nullptr) throw InputError("no session \"" + call.session + "\" is open");
+    const bool hasSensor = call.kind != CallKind::uninit;
+    if (hasSensor && sensor == nullptr) throw InputError("no session \"" + call.session + "\" is open");
     if (!isConcerned(sensor) || filter.isBehind()) return;
     const bool isBefore = !filter.isWithin();
     if (!isBefore) writeCarried();
@@ -157,8 +157,7 @@ class Trimmer {
 
   // What is no sensor's concerns all.
   bool isConcerned(const Sensor* sensor) const {
-    return sensor == nullptr || sensors.empty() ||
-           std::find(sensors.begin(), sensors.end(), sensor->name) != sensors.end();
+    return sensor == nullptr || sensors.empty() || sensors.count(sensor->name) != 0;
   }
 
   // The line that was read last, as a function changes it.
@@ -187,8 +186,8 @@ class Trimmer {
   std::FILE* out;
   TraceReader reader;
   RecordedCalls filter;
-  std::vector<std::string> sensors;  // concerned; empty: all
-  const bool isFailedOnly;           // what a record is refused for has nothing to do with those before it
+  std::set<std::string> sensors;  // concerned; empty: all
+  const bool isFailedOnly;        // what a record is refused for has nothing to do with those before it
   std::optional<NewFile> target;
   std::unordered_set<int64_t> keptLists;  // by their numbers
   std::vector<Carried> carried;
