@@ -71,6 +71,7 @@ std::string reasonText(const Account& account) {
 void Board::onOutcome(const CallOutcome& outcome) {
   if (outcome.sensor == nullptr || outcome.call.line == 0) return;  // the tool closes what is left open
   Client& client = clientOf(outcome.session, outcome.sensor);
+  if (isWanted) client.isShown = true;
   switch (outcome.call.kind) {
     case CallKind::open:
       client.isOpen = !outcome.failed;
@@ -80,6 +81,7 @@ void Board::onOutcome(const CallOutcome& outcome) {
       client.isOpen = false;
       break;
     case CallKind::dispatch:
+      if (!isWanted) break;
       ++client.records;
       if (!outcome.result) break;
       ++client.results;
@@ -100,8 +102,19 @@ void Board::onCall(const ExplainedCall& call) {
 }
 
 void Board::onRecord(const ExplainedRecord& record) {
+  if (!isWanted) return;
   Account& account = clientOf(record.outcome.session, record.outcome.sensor).account;
   ++(record.unexplained.empty() ? account.fates[static_cast<size_t>(record.verdict.fate)] : account.unexplained);
+}
+
+void Board::onEnd(const std::vector<Account>& accounts) {
+  for (const Account& account : accounts) {
+    const Client& client = clientOf(account.session, account.sensor);
+    if (!client.isShown) continue;
+    summary.push_back(account);
+    summary.back().fates = client.account.fates;
+    summary.back().unexplained = client.account.unexplained;
+  }
 }
 
 void Board::measure(Clock::time_point now) {
@@ -118,6 +131,7 @@ void Board::measure(Clock::time_point now) {
 std::vector<BoardRow> Board::rows() const {
   std::vector<BoardRow> rows;
   for (const Client& client : clients) {
+    if (!client.isShown) continue;
     rows.push_back({.session = client.account.session,
                     .sensor = client.account.sensor->name,
                     .request = client.isOpen ? client.request : "closed",

@@ -32,22 +32,26 @@ class Board final : public ReplayObserver, public ExplanationOutput {
  public:
   using Clock = std::chrono::steady_clock;
 
+  // Whether the call that it is told of next is to be shown: counted, and its client given a row.
+  void choose(bool isNextWanted) { isWanted = isNextWanted; }
+
   void onOutcome(const CallOutcome& outcome) override;
   void onEnd() override {}
   void onCall(const ExplainedCall& call) override;
   void onRecord(const ExplainedRecord& record) override;
-  void onEnd(const std::vector<Account>& accounts) override { summary = accounts; }
+  void onEnd(const std::vector<Account>& accounts) override;
 
   // Counts for the rates, which are those of the time between two calls that are a second or more apart.
   void measure(Clock::time_point now);
 
   std::vector<BoardRow> rows() const;
-  // What became of all records, once the trace is at its end.
+  // What became of the records that were counted, once the trace is at its end.
   const std::vector<Account>& accounts() const { return summary; }
 
  private:
   struct Client {
     Account account;  // its fates
+    bool isShown = false;
     bool isOpen = false;
     std::string request = {};
     size_t records = 0;
@@ -59,6 +63,7 @@ class Board final : public ReplayObserver, public ExplanationOutput {
 
   Client& clientOf(const std::string& session, const Sensor* sensor);
 
+  bool isWanted = true;
   std::vector<Client> clients;
   std::map<std::pair<const Sensor*, std::string>, size_t> places;  // in `clients`
   Clock::time_point lastMeasurement = Clock::time_point::min();

@@ -13,7 +13,8 @@ constexpr std::chrono::milliseconds kInterval(100);
 
 }  // namespace
 
-LiveBoard::LiveBoard(std::FILE* output, std::string heading) : out(output), title(std::move(heading)) {
+LiveBoard::LiveBoard(std::FILE* output, std::string heading)
+    : out(output), title(std::move(heading)), explainer(board, log) {
   if (!TerminalScreen::isPossible(out)) return;
   held.emplace();
   screen.emplace(out);
@@ -21,13 +22,12 @@ LiveBoard::LiveBoard(std::FILE* output, std::string heading) : out(output), titl
 
 void LiveBoard::begin(const FilterArguments& filterArguments, const TraceReader& trace) {
   filter.emplace(filterArguments, trace);
-  filtered.emplace(board, *filter);
-  explainer.emplace(*filtered, log);
 }
 
 void LiveBoard::onOutcome(const CallOutcome& outcome) {
-  explainer->onOutcome(outcome);
-  if (filter->takes(outcome)) board.onOutcome(outcome);
+  board.choose(filter->takes(outcome));
+  explainer.onOutcome(outcome);
+  board.onOutcome(outcome);
   refresh();
 }
 

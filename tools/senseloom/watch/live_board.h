@@ -6,7 +6,6 @@
 #include <vector>
 
 #include "explain/explainer.h"
-#include "explain/filtered_explanation.h"
 #include "explain/log_capture.h"
 #include "trace/call_filter.h"
 #include "trace/replayer.h"
@@ -30,7 +29,7 @@ class LiveBoard final : public ReplayObserver {
   void begin(const FilterArguments& filterArguments, const TraceReader& trace);
 
   void onOutcome(const CallOutcome& outcome) override;
-  void onEnd() override { explainer->onEnd(); }
+  void onEnd() override { explainer.onEnd(); }
 
   // Reads keys and draws the screen, unless that was done within the last tenth of a second.
   void refresh();
@@ -48,9 +47,8 @@ class LiveBoard final : public ReplayObserver {
   const std::string title;
   LogCapture log;
   Board board;
-  std::optional<CallFilter> filter;  // all three from begin() on
-  std::optional<FilteredExplanation> filtered;
-  std::optional<Explainer> explainer;
+  Explainer explainer;
+  std::optional<CallFilter> filter;  // from begin() on
   BoardView view;
   std::vector<BoardRow> rows;  // as they are shown
   Board::Clock::time_point nextRefresh = Board::Clock::time_point::min();
