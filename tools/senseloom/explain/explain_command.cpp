@@ -30,7 +30,7 @@ void requireObject(const std::string& session, const std::string& option) {
 }
 
 // A mistyped sensor looks like the name of a file.
-TraceReader openTrace(const std::string& file, const Reading& reading) try {
+TraceReader openTrace(const std::string& file, const TraceReading& reading) try {
   return TraceReader(file, TraceReader::printOnStandardError, reading);
 } catch (const InputError& error) {
   const std::string nearest = nearestSensor(file);

@@ -33,7 +33,7 @@ bool hasMember(const Json& object, const char* key) {
 
 }  // namespace
 
-TraceReader::TraceReader(const std::string& file, Remark toRemark, Reading reading)
+TraceReader::TraceReader(const std::string& file, Remark toRemark, TraceReading reading)
     : name(file == "-" ? "standard input" : file), remark(std::move(toRemark)) {
   if (!reading.follows) beforeRead = reading.meanwhile;
   stream = open(file, name, reading.follows, [this, meanwhile = std::move(reading.meanwhile)] {

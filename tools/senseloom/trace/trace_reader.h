@@ -17,7 +17,7 @@
 namespace senseloom::tool {
 
 // How a trace is read.
-struct Reading {
+struct TraceReading {
   // Of a file the end is waited for, too: until the recording has its end, or the user interrupts it.
   bool follows = false;
   // Called before each read of some hundred lines, so before every wait, too; if it follows, only while it waits, at
@@ -36,7 +36,7 @@ class TraceReader {
   static void printOnStandardError(const std::string& text);
 
   // "-" is standard input. Throws InputError when the file cannot be opened.
-  explicit TraceReader(const std::string& file, Remark remark = printOnStandardError, Reading reading = {});
+  explicit TraceReader(const std::string& file, Remark remark = printOnStandardError, TraceReading reading = {});
   TraceReader(const TraceReader&) = delete;
   TraceReader& operator=(const TraceReader&) = delete;
 
