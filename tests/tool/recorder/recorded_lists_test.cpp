@@ -107,7 +107,6 @@ TEST(RecordedLists, AreNothingForAReplayHoweverTheyAreReleased) {
                                                   {"convert", "--to", "csv", "-"},
                                                   {"convert", "--to", "perfetto", "-"},
                                                   {"view", "-"},
-                                                  {"watch", "-"},
                                                   {"sweep", "--session", "a", "--set", "logN=1,2", "-"}}) {
     const ToolRun without = runTool(command, trace);
     const ToolRun with = runTool(command, trace + releases);
