@@ -128,7 +128,7 @@ TEST(RecordFiles, MakesPartsThatHoldWhatTheGestureEngineAnswered) {
 TEST(RecordFiles, LeavesThePartsOfAnEarlierRecordingAlone) {
   const ScratchFolder folder("old_parts");
   std::ofstream(folder.file("trace.2.jsonl")) << "mine\n";
-  recordDriven(folder.file("trace.jsonl"), kLines, {"--max-size", "6k"});
+  recordDriven(folder.file("trace.jsonl"), kLines, {"--max-size", "8k"});
   EXPECT_EQ(folder.files(), (std::vector<std::string>{"trace.2.jsonl", "trace.3.jsonl", "trace.jsonl"}));
   EXPECT_EQ(contentOf(folder.file("trace.2.jsonl")), "mine\n");
 }
