@@ -22,8 +22,9 @@ TEST_P(RecordedSignal, LeavesEveryFinishedCallAndTheCause) {
   EXPECT_EQ(run.err, summaryOf(102, trace.name));
   const ToolRun checked = check(trace.name);
   EXPECT_EQ(checked.out, "102 calls compared, all as recorded\n");
+  // Before it are the head, the calls and the release of a property list.
   EXPECT_EQ(checked.err,
-            "senseloom: " + trace.name + ":104: the program was ended by a signal: " + strsignal(GetParam()) + "\n");
+            "senseloom: " + trace.name + ":105: the program was ended by a signal: " + strsignal(GetParam()) + "\n");
 }
 
 INSTANTIATE_TEST_SUITE_P(All, RecordedSignal, testing::Values(SIGINT, SIGTERM, SIGKILL, SIGABRT),
