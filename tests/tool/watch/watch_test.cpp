@@ -135,7 +135,7 @@ TEST(WatchedProgram, HasNoScreenWithoutATerminal) {
 
 // What b asks for is negotiated with a, which has no row even so. The first record of b comes before the part.
 TEST(WatchedProgram, IsShownAsFarAsItIsWanted) {
-  ProgramOnTerminal watch({TOOL_FILE, "watch", "--session", "s2", "--from", "6", "--", DRIVEN_FILE},
+  ProgramOnTerminal watch({TOOL_FILE, "watch", "--session", "s2", "--from", "7", "--", DRIVEN_FILE},
                           recordingEnvironment(), true);
   watch.tell("open a PHYAC");
   watch.tell("open b PHYAC");
