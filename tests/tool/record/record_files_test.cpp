@@ -149,7 +149,7 @@ TEST_P(CompressedRecording, IsReadByEveryCommand) {
 
 TEST_P(CompressedRecording, HasPartsThatReplayAlone) {
   const ScratchFolder folder("compressed_parts");
-  recordDriven(folder.file("trace.jsonl." + GetParam()), kLines, {"--max-size", "6k"});
+  recordDriven(folder.file("trace.jsonl." + GetParam()), kLines, {"--max-size", "8k"});
   EXPECT_EQ(folder.files(), (std::vector<std::string>{"trace.2.jsonl." + GetParam(), "trace.jsonl." + GetParam()}));
   for (const std::string& name : folder.files()) EXPECT_EQ(check(folder.file(name)).status, 0) << name;
 }
