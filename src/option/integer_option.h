@@ -26,7 +26,7 @@ ctx_option_t* makeList(const OptionDescription& kind, std::span<int32_t> values)
 
 // For each property of a kind the key whose setting it shows; the number of keys where it shows none.
 template <const OptionDescription& kDescription>
-constexpr auto shownKeys() {
+constexpr auto shownKeys() {  // not covered: runs while compiling
   std::array<size_t, kDescription.properties.size()> keys{};
   for (size_t i = 0; i < keys.size(); ++i) keys[i] = kDescription.findKey(kDescription.properties[i].name);
   return keys;
