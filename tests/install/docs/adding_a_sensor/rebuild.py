@@ -64,7 +64,8 @@ class Rebuild:
         moved = re.sub(rf"{re.escape(self.root)}(?=[/ ])(?!/{re.escape(os.path.relpath(self.build, self.root))}/)",
                        self.tree, command)
         moved = re.sub(r" -MD -MT \S+ -MF \S+", "", moved)
-        moved = re.sub(r" -Winvalid-pch| -include \S+/cmake_pch\.hxx", "", moved)  # precompiled for other sources
+        # Precompiled for other sources; clang takes it in other words than gcc.
+        moved = re.sub(r" -Winvalid-pch|( -Xclang)? -include(-pch)?( -Xclang)? \S+/cmake_pch\.hxx(\.pch)?", "", moved)
         arguments = [str(made) if argument == name else argument for argument in shlex.split(moved)]
         if "/Unity/" in arguments[-1]:  # several sources in one, each by its full path
             together = made.with_suffix(".cxx")
