@@ -156,6 +156,16 @@ TEST(Info, TellsListsThatAreNeverReleasedAndThoseReleasedWrongly) {
             "\n");
 }
 
+// A list is of the call that gave it, so a release without that call tells nothing.
+TEST(Info, TellsTheListsOfTheWantedCalls) {
+  const std::string told = runTool({"info", "--session", "s1", "-"}, kLists).out;
+  EXPECT_NE(told.find("lists: 2 given, 2 released\n"), std::string::npos) << told;
+  EXPECT_EQ(told.find("leak:"), std::string::npos) << told;
+  const std::string other = runTool({"info", "--session", "s2", "-"}, kLists).out;
+  EXPECT_NE(other.find("lists: 2 given, 1 released\n"), std::string::npos) << other;
+  EXPECT_NE(other.find("leak: list 2, "), std::string::npos) << other;
+}
+
 TEST(Info, CountsTheListsBeyondTheFirstThatAreNeverReleased) {
   std::string trace = "{\"call\":\"open\",\"session\":\"a\",\"sensor\":\"STAP\"}\n";
   for (int list = 1; list <= 7; ++list) {

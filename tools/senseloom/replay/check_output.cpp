@@ -66,8 +66,9 @@ void CheckOutput::printDifference(const CallOutcome& outcome, const json_t* actu
                outcome.session.c_str());
   printDifferences(out, "recorded", "now", differences);
   const bool dependsOnEngine = outcome.call.kind == CallKind::dispatch && outcome.sensor->items == Items::samples;
-  if (dependsOnEngine && !hasEngine)
+  if (dependsOnEngine && !hasEngine) {
     std::fputs("  the recording does not hold what the platform's gesture engine answered\n", out);
+  }
   if (different == 1) std::fputs("  this is the first difference: what follows may come of it\n", out);
 }
 
