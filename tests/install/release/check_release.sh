@@ -35,7 +35,7 @@ case $2 in
     release
     diff <(git tag --list --format='%(objecttype) %(refname) %(contents)') - <<<$'tag refs/tags/v2.5.1 senseloom 2.5.1\n\n- News.\n'
     diff <(ls build/release/2.5.1) - <<<$'NOTES.md\nSHA256SUMS\nsenseloom-2.5.1.tar.gz\nsenseloom_2.5.1_amd64.deb'
-    tar -tf build/release/2.5.1/senseloom-2.5.1.tar.gz | grep -qx senseloom-2.5.1/CHANGELOG.md
+    tar -tf build/release/2.5.1/senseloom-2.5.1.tar.gz | grep -x senseloom-2.5.1/CHANGELOG.md >/dev/null # which reads all
     (cd build/release/2.5.1 && sha256sum --quiet --check SHA256SUMS)
     exit
     ;;
